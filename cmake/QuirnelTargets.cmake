@@ -1,0 +1,86 @@
+# How every library, program and test of the tree is declared.
+
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+
+set(QUIRNEL_SANITIZE "" CACHE STRING "Sanitizers for all of our code: empty, 'address,undefined' or 'thread'")
+
+find_program(QUIRNEL_CCACHE ccache)
+if(QUIRNEL_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
+  set(CMAKE_CXX_COMPILER_LAUNCHER "${QUIRNEL_CCACHE}")
+endif()
+
+add_library(quirnel_options INTERFACE)
+target_compile_options(quirnel_options INTERFACE
+  -Wall -Wextra -Wshadow -Wconversion -Wnon-virtual-dtor -Woverloaded-virtual -Werror
+  $<$<CXX_COMPILER_ID:Clang>:-Wthread-safety>)
+if(QUIRNEL_SANITIZE)
+  target_compile_options(quirnel_options INTERFACE
+    -fsanitize=${QUIRNEL_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
+  target_link_options(quirnel_options INTERFACE -fsanitize=${QUIRNEL_SANITIZE})
+endif()
+if(QUIRNEL_FUZZ)
+  target_compile_options(quirnel_options INTERFACE -fsanitize=fuzzer-no-link)
+endif()
+target_link_libraries(quirnel_options INTERFACE Threads::Threads)
+
+# quirnel_library(NAME SOURCES a.cpp ... [PUBLIC lib ...] [PRIVATE lib ...])
+# A static library whose own folder is on its users' include path.
+function(quirnel_library name)
+  cmake_parse_arguments(ARG "" "" "SOURCES;PUBLIC;PRIVATE" ${ARGN})
+  add_library(${name} STATIC ${ARG_SOURCES})
+  target_include_directories(${name} PUBLIC "${CMAKE_CURRENT_SOURCE_DIR}")
+  target_link_libraries(${name} PUBLIC ${ARG_PUBLIC} PRIVATE quirnel_options ${ARG_PRIVATE})
+endfunction()
+
+# quirnel_program(NAME SOURCES a.cpp ... LINKS lib ...)
+function(quirnel_program name)
+  cmake_parse_arguments(ARG "" "" "SOURCES;LINKS" ${ARGN})
+  add_executable(${name} ${ARG_SOURCES})
+  target_link_libraries(${name} PRIVATE ${ARG_LINKS} quirnel_options)
+endfunction()
+
+# quirnel_test(NAME TIER quick|full|desktop|soak SOURCES a.cpp ... LINKS lib ... [TIMEOUT seconds] [SERIAL])
+# One GoogleTest program, run as one ctest entry labelled with its tier.
+# Every source under tests/ must come through here (or quirnel_test_sources).
+function(quirnel_test name)
+  cmake_parse_arguments(ARG "SERIAL" "TIER;TIMEOUT" "SOURCES;LINKS" ${ARGN})
+  if(NOT ARG_TIER)
+    set(ARG_TIER quick)
+  endif()
+  if(NOT ARG_TIMEOUT)
+    set(ARG_TIMEOUT 300)
+  endif()
+  add_executable(${name} ${ARG_SOURCES})
+  target_link_libraries(${name} PRIVATE ${ARG_LINKS} quirnel_options GTest::gtest GTest::gmock GTest::gtest_main)
+  target_include_directories(${name} PRIVATE "${PROJECT_SOURCE_DIR}" "${PROJECT_SOURCE_DIR}/tests")
+  add_test(NAME ${name} COMMAND ${name})
+  set_tests_properties(${name} PROPERTIES LABELS ${ARG_TIER} TIMEOUT ${ARG_TIMEOUT}
+    ENVIRONMENT "QT_QPA_PLATFORM=offscreen;TSAN_OPTIONS=ignore_noninstrumented_modules=1:suppressions=${PROJECT_SOURCE_DIR}/tests/support/tsan.supp;LSAN_OPTIONS=suppressions=${PROJECT_SOURCE_DIR}/tests/support/lsan.supp:print_suppressions=0;UBSAN_OPTIONS=print_stacktrace=1")
+  if(ARG_SERIAL)
+    set_tests_properties(${name} PROPERTIES RUN_SERIAL TRUE)
+  endif()
+  quirnel_test_sources(${ARG_SOURCES})
+endfunction()
+
+# Declares sources under tests/ that reach the build some other way (support libraries, fuzzers).
+function(quirnel_test_sources)
+  foreach(source IN LISTS ARGN)
+    get_filename_component(path "${source}" ABSOLUTE)
+    set_property(GLOBAL APPEND PROPERTY QUIRNEL_TEST_SOURCES "${path}")
+  endforeach()
+endfunction()
+
+# A test file that nobody runs is an error at configuration time.
+function(quirnel_check_every_test_file_is_registered folder)
+  file(GLOB_RECURSE present CONFIGURE_DEPENDS "${folder}/*.cpp")
+  get_property(registered GLOBAL PROPERTY QUIRNEL_TEST_SOURCES)
+  foreach(path IN LISTS present)
+    if(NOT path IN_LIST registered)
+      message(FATAL_ERROR "${path} is not registered with the build: add it to a quirnel_test() or delete it")
+    endif()
+  endforeach()
+endfunction()

@@ -1,0 +1,1 @@
+// Replaced by this kit's first source.
