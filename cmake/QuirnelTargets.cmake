@@ -16,6 +16,7 @@ endif()
 add_library(quirnel_options INTERFACE)
 target_compile_options(quirnel_options INTERFACE
   -Wall -Wextra -Wshadow -Wconversion -Wnon-virtual-dtor -Woverloaded-virtual -Werror
+  -Wno-multichar # type codes and message codes are four-character constants
   $<$<CXX_COMPILER_ID:Clang>:-Wthread-safety>)
 if(QUIRNEL_SANITIZE)
   target_compile_options(quirnel_options INTERFACE
