@@ -1,0 +1,65 @@
+#!/usr/bin/env bash
+# Builds and runs the tests. Usage: ./test.sh [quick|full|soak]   (default full: everything but the soak tier)
+# The last line says how many tests passed and failed.
+set -uo pipefail
+cd "$(dirname "$0")"
+tier=${1:-full}
+
+case "$tier" in
+    quick) labels='^quick$' ;;
+    full) labels='^(quick|full|desktop)$' ;;
+    soak) labels='.' ;;
+    *) echo "usage: $0 [quick|full|soak]" >&2; exit 2 ;;
+esac
+
+tools/install-dependencies test || { echo "0 passed, 1 failed"; exit 1; }
+
+results=$PWD/build/test-results
+rm -rf "$results"
+mkdir -p "$results"
+failures=0
+
+# A step that is no GoogleTest program counts as one test.
+step() {
+    local name=$1
+    shift
+    printf '\n== %s\n' "$name"
+    if "$@"; then
+        echo "step $name: passed" >>"$results/steps"
+    else
+        echo "step $name: FAILED"
+        echo "step $name: failed" >>"$results/steps"
+        failures=$((failures + 1))
+    fi
+}
+
+run_preset() {
+    local preset=$1 only=$2
+    cmake --preset "$preset" >"$results/$preset-configure.log" 2>&1 || { cat "$results/$preset-configure.log"; return 1; }
+    cmake --build --preset "$preset" >"$results/$preset-build.log" 2>&1 || { tail -n 60 "$results/$preset-build.log"; return 1; }
+    GTEST_OUTPUT="xml:$results/$preset/" ctest --preset "$preset" -j "$(nproc)" --no-tests=error -L "$only" ||
+        return 1
+}
+
+run_fuzzers() {
+    cmake --preset fuzz >"$results/fuzz-configure.log" 2>&1 || { cat "$results/fuzz-configure.log"; return 1; }
+    cmake --build --preset fuzz --target fuzzers >"$results/fuzz-build.log" 2>&1 || { tail -n 60 "$results/fuzz-build.log"; return 1; }
+    tests/fuzz/run-fuzzers build/fuzz/tests/fuzz "${QUIRNEL_FUZZ_SECONDS:-15}"
+}
+
+check_format() {
+    git ls-files -z '*.cpp' '*.h' | xargs -0 -r -n 40 clang-format --dry-run -Werror
+}
+
+step "layers" tools/check-layers
+step "layers check catches a breach" tests/tools/check-layers-test
+if command -v clang-format >/dev/null && git rev-parse --git-dir >/dev/null 2>&1; then
+    step "format" check_format
+fi
+step "tests under AddressSanitizer and UndefinedBehaviorSanitizer" run_preset dev "$labels"
+step "tests under ThreadSanitizer" run_preset tsan '^quick$'
+step "fuzzers" run_fuzzers
+step "the tour, as ./run.sh shows it" ./run.sh
+
+python3 tests/support/count_results.py "$results"
+exit $((failures > 0))
