@@ -2,9 +2,8 @@
 // Success is B_OK (0) or a positive answer such as a count or an id; every failure is negative.
 #pragma once
 
-#include <limits.h>
+#include <cstring>
 #include <stdint.h>
-#include <string.h>
 
 typedef int32_t status_t;
 

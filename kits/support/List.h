@@ -32,7 +32,6 @@ class BList {
     // Removes and answers the item at `index`.
     void* RemoveItem(int32 index);
     bool RemoveItems(int32 index, int32 count);
-    // Answers nothing about the former item, which is simply no longer in the list.
     bool ReplaceItem(int32 index, void* item);
     void MakeEmpty();
 

@@ -1,0 +1,7 @@
+#include <Flattenable.h>
+
+BFlattenable::~BFlattenable() = default;
+
+bool BFlattenable::AllowsTypeCode(type_code code) const {
+    return code == TypeCode();
+}
