@@ -28,6 +28,9 @@ struct thread_schedule {
     io_class io = io_class::normal;
 };
 
+/// The niceness that this process was started with, as far as its first caller can see.
+int process_niceness();
+
 /// False when the system refused either part; the other one is applied all the same. Making a thread more
 /// urgent than it is needs a privilege that desktop programs do not have.
 bool set_thread_schedule(native_thread thread, thread_schedule schedule);

@@ -69,6 +69,12 @@ std::string thread_name(native_thread thread) {
     return name;
 }
 
+int process_niceness() {
+    // Asked for the main thread, once: later it may have been changed.
+    static const int niceness = getpriority(PRIO_PROCESS, static_cast<id_t>(getpid()));
+    return niceness;
+}
+
 bool set_thread_schedule(native_thread thread, thread_schedule schedule) {
     const bool niceness_set = setpriority(PRIO_PROCESS, static_cast<id_t>(thread), schedule.niceness) == 0;
     const int io = (schedule.io == io_class::idle ? kIoClassIdle : kIoClassNone) << kIoClassShift;

@@ -31,10 +31,10 @@ enum : uint32 {
 typedef int32 (*thread_func)(void* data);
 typedef thread_func thread_entry;
 
-// A higher number is more urgent. On this host: B_LOW_PRIORITY and everything below means nice +10 (+19 for
-// 0) and the idle I/O class for that thread; everything from B_NORMAL_PRIORITY on means the default, because
-// a plain user cannot raise a thread. Nor can a plain user undo a lowering: the thread then stays as slow as
-// it was.
+// A higher number is more urgent. On this host: below B_NORMAL_PRIORITY a thread is ten steps nicer than the
+// process (at B_IDLE_PRIORITY as nice as can be) and in the idle I/O class; everything from B_NORMAL_PRIORITY
+// on means the process's own schedule, because a plain user cannot raise a thread. Nor can a plain user undo
+// a lowering: the thread then stays as nice as it was, and so do the threads that it spawns.
 enum : int32 {
     B_IDLE_PRIORITY = 0,
     B_LOWEST_ACTIVE_PRIORITY = 1,

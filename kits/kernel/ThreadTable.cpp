@@ -1,13 +1,15 @@
 #include <CopyText.h>
 #include <ThreadTable.h>
 
+#include <algorithm>
 #include <cstring>
 
 namespace {
 
 constexpr size_t kMaxUnobserved = 256;
+// What is added to the process's own niceness, up to the greatest there is.
 constexpr int kLowNiceness = 10;
-constexpr int kIdleNiceness = 19;
+constexpr int kGreatestNiceness = 19;
 
 thread_local ThreadRecord* tRecord = nullptr;
 thread_local bool tEnding = false;
@@ -198,8 +200,11 @@ void run_thread(std::shared_ptr<ThreadRecord> record) {
 
 void apply_priority(host::native_thread native, int32 priority) {
     host::thread_schedule schedule;
+    schedule.niceness = host::process_niceness();
     if (priority < B_NORMAL_PRIORITY) {
-        schedule.niceness = priority <= B_IDLE_PRIORITY ? kIdleNiceness : kLowNiceness;
+        schedule.niceness = priority <= B_IDLE_PRIORITY
+                                ? kGreatestNiceness
+                                : std::min(schedule.niceness + kLowNiceness, kGreatestNiceness);
         schedule.io = host::io_class::idle;
     }
     // A refusal leaves the thread as it was, which is all that a plain user can have.

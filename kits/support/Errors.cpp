@@ -56,7 +56,7 @@ constexpr Text kTexts[] = {
     {B_ALREADY_RUNNING, "Already running"},
     {B_LAUNCH_FAILED, "Program could not be started"},
     {B_AMBIGUOUS_APP_LAUNCH, "Several programs could be started"},
-    {B_UNKNOWN_MIME_TYPE, "Unknown type of file"},
+    {B_UNKNOWN_MIME_TYPE, "Type of file is not known"},
     {B_BAD_SCRIPT_SYNTAX, "Scripting message is not valid"},
     {B_LAUNCH_FAILED_NO_RESOLVE_LINK, "Program could not be started: its link leads nowhere"},
     {B_LAUNCH_FAILED_EXECUTABLE, "Program could not be started: it is not executable"},
