@@ -11,6 +11,8 @@
 
 namespace host {
 
+struct AttributeMarker;
+
 /// One attribute as AttributeScanner hands it out; views are valid during the call only.
 struct ScannedAttribute {
     std::string_view name;
@@ -44,6 +46,7 @@ class AttributeScanner {
   private:
     using Callback = void (*)(void* target, const ScannedAttribute& attribute);
     Status scan_erased(const AttributeFile& file, Callback callback, void* target);
+    bool read_spilled(const AttributeFile& file, const AttributeMarker& marker, ScannedAttribute& attribute);
 
     std::size_t largest_value_ = 0;
     std::vector<char> names_;

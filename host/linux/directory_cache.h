@@ -4,44 +4,20 @@
 #include "host/api/result.h"
 #include "host/api/thread_safety.h"
 #include "host/linux/descriptor.h"
+#include "host/linux/directory.h"
+#include "host/linux/volume_snapshot.h"
+#include <condition_variable>
 #include <cstddef>
 #include <cstdint>
 #include <list>
 #include <memory>
 #include <string>
 #include <sys/stat.h>
+#include <thread>
 #include <unordered_map>
+#include <vector>
 
 namespace host {
-
-/// An open directory. Its descriptor serves openat and fstatat; it is shared between threads, so nothing that
-/// moves its read position may be done with it (see reopen_directory). Any thread.
-class Directory {
-  public:
-    Directory(Descriptor descriptor, DeviceId device, const struct stat& status);
-
-    int descriptor() const { return descriptor_.get(); }
-    DeviceId device() const { return device_; }
-    /// st_dev of the directory.
-    dev_t file_system_device() const { return file_system_device_; }
-    std::uint64_t inode() const { return inode_; }
-    NodeId id() const { return {device_, inode_}; }
-
-    /// Absolute path as it is now, whatever was renamed. ENOENT when the directory has been removed.
-    Result<std::string> path() const;
-    /// Its name in its parent as it is now ("." for "/"). Remembered, and read again only when the
-    /// directory's change time has moved.
-    Result<std::string> leaf() const;
-
-  private:
-    const Descriptor descriptor_;
-    const DeviceId device_;
-    const dev_t file_system_device_;
-    const std::uint64_t inode_;
-    mutable Mutex leaf_mutex_;
-    mutable std::string leaf_ GUARDED_BY(leaf_mutex_);
-    mutable std::int64_t leaf_change_time_ GUARDED_BY(leaf_mutex_) = -1;
-};
 
 /// Finds open directories by volume and inode: the last few hundred stay open, and for many more is
 /// remembered in which directory they were last seen and under what name. Any thread.
@@ -54,12 +30,14 @@ class DirectoryCache {
 
     explicit DirectoryCache(std::size_t open_limit = 384, std::size_t hint_limit = 65536);
     ~DirectoryCache();
+    DirectoryCache(const DirectoryCache&) = delete;
+    DirectoryCache& operator=(const DirectoryCache&) = delete;
 
     using Handle = std::shared_ptr<const Directory>;
 
     /// `whole_volume`: where neither the open directories nor the hints lead to it, the directory that it was
-    /// last seen in is searched and then, breadth first, all directories of the volume. `hints_only` spares
-    /// that.
+    /// last seen in is searched and then, breadth first, all directories of the volume. That takes seconds on
+    /// a large one, so whoever asks for many that may be gone asks for `hints_only`.
     enum class Search { hints_only, whole_volume };
     /// ENOENT when the volume has no such directory (any more), ENODEV when there is no such volume.
     Result<Handle> find(DeviceId device, std::uint64_t inode, Search search = Search::whole_volume);
@@ -67,10 +45,10 @@ class DirectoryCache {
     /// Takes over a directory that the caller has opened and knows to lie on `device`. When it is open
     /// already the one that is open is returned.
     Handle adopt(Descriptor descriptor, DeviceId device, const struct stat& status);
-    /// Opens a subdirectory; its volume is looked up where it may be another one than the parent's. ENOTDIR,
-    /// ENOENT, EACCES ...
+    /// Opens a subdirectory (not ".."); its volume is looked up where it may be another one than the
+    /// parent's. ENOTDIR, ENOENT, EACCES ...
     Result<Handle> open_child(const Directory& parent, const char* leaf);
-    /// Opens a directory by absolute path; symbolic links on the way are followed.
+    /// Opens a directory by absolute path; symbolic links on the way and at its end are followed.
     Result<Handle> open_path(const char* path);
 
     /// Tells where a directory is thought to be, so that find() needs no search. May be wrong: whatever is
@@ -95,25 +73,42 @@ class DirectoryCache {
     struct Slot {
         Key key;
         Handle directory;
+        /// Steady clock, nanoseconds; kept for directories that must not stay open only.
         std::int64_t last_use = 0;
+        bool closes_when_idle = false;
     };
     struct Hint {
         std::uint64_t parent = 0;
         std::string leaf;
     };
-    class Janitor;
 
     Handle find_open(const Key& key);
+    Result<Handle> find_root(const Key& key);
     Result<Handle> find_by_hint(const Key& key, int depth);
-    Result<Handle> search_parent(const Key& key);
+    Result<Handle> find_in_hinted_parent(const Key& key);
     Result<Handle> search_volume(const Key& key);
+    /// Opens `path` below `base` and keeps it when it is the directory that is wanted.
+    Result<Handle> open_wanted(const Key& key, int base, const char* path, const VolumeSnapshot& volumes);
+    /// Remembers where directories that are about to be closed are.
+    void remember_closed(const std::vector<Handle>& closed);
+    void start_janitor() REQUIRES(mutex_);
+    void run_janitor();
 
     const std::size_t open_limit_;
     const std::size_t hint_limit_;
+    /// Held while a volume is searched: a second search waits, and often finds what the first one opened.
+    /// Taken before mutex_.
+    Mutex search_mutex_;
     mutable Mutex mutex_;
-    std::list<Slot> recent_ GUARDED_BY(mutex_);
+    std::list<Slot> recent_ GUARDED_BY(mutex_); ///< most recently used first
     std::unordered_map<Key, std::list<Slot>::iterator, KeyHash> open_ GUARDED_BY(mutex_);
     std::unordered_map<Key, Hint, KeyHash> hints_ GUARDED_BY(mutex_);
+    /// Searched for in vain: until when, on the steady clock, no new search is made.
+    std::unordered_map<Key, std::int64_t, KeyHash> missing_ GUARDED_BY(mutex_);
+    std::thread janitor_ GUARDED_BY(mutex_);
+    bool janitor_runs_ GUARDED_BY(mutex_) = false;
+    bool ending_ GUARDED_BY(mutex_) = false;
+    std::condition_variable_any wake_;
 };
 
 } // namespace host
