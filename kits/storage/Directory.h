@@ -6,6 +6,7 @@
 
 class BFile;
 class BSymLink;
+struct FoundEntry;
 
 namespace host {
 class DirectoryReader;
@@ -60,13 +61,14 @@ class BDirectory : public BNode, public BEntryList {
     status_t CreateSymLink(const char* path, const char* linkToPath, BSymLink* link);
 
   private:
-    status_t OpenReader();
-    status_t NextRef(entry_ref* ref, ino_t* node);
+    status_t NextEntry(FoundEntry& entry);
+    status_t SetToNode(const node_ref& node);
 
+    node_ref mDirectory;
+    // Made by the first question for an entry.
     std::unique_ptr<host::DirectoryReader> mReader;
-    // Read by GetNextDirents() but too large for what was left of its buffer.
-    struct PendingEntry;
-    std::unique_ptr<PendingEntry> mPending;
+    // Read for GetNextDirents(), but too large for what was left of its buffer.
+    std::unique_ptr<FoundEntry> mPending;
 };
 
 // Makes a directory and those above it that are missing. An existing directory is success; something else

@@ -79,6 +79,8 @@ class BNode : public BStatable {
     // Takes over an open node (or none, with the reason) that was found at `ref`.
     status_t Adopt(std::shared_ptr<host::Node> node, const entry_ref& ref, status_t status);
     host::Node* HostNode() const { return mNode.get(); }
+    // Where the node was found; by now the file may be called otherwise.
+    const entry_ref& FoundAt() const { return mRef; }
 
   private:
     friend class BNodeInfo;
@@ -87,7 +89,6 @@ class BNode : public BStatable {
     status_t WriteStat(const struct stat& stat, uint32 what) override;
 
     std::shared_ptr<host::Node> mNode;
-    // Where the node was found; by now the file may be called otherwise.
     entry_ref mRef;
     status_t mStatus = B_NO_INIT;
     std::vector<std::string> mAttributeNames;

@@ -51,17 +51,8 @@ class BStatable {
     // B_BAD_VALUE when the file lies on no volume.
     status_t GetVolume(BVolume* volume) const;
 
-  protected:
-    // Which fields of a stat structure a change is about.
-    enum : uint32 {
-        kStatPermissions = 0x01,
-        kStatOwner = 0x02,
-        kStatGroup = 0x04,
-        kStatAccessTime = 0x08,
-        kStatModificationTime = 0x10,
-    };
-
   private:
     virtual status_t ReadStat(host::NodeStat* stat) const = 0;
+    // `what`: bits of <StatFields.h>.
     virtual status_t WriteStat(const struct stat& stat, uint32 what) = 0;
 };

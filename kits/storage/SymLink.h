@@ -27,4 +27,7 @@ class BSymLink : public BNode {
     ssize_t MakeLinkedPath(const BDirectory* directory, BPath* path);
 
     bool IsAbsolute();
+
+  private:
+    status_t ReadTarget(std::string& target) const;
 };

@@ -1,0 +1,3 @@
+#include <EntryList.h>
+
+BEntryList::~BEntryList() = default;
