@@ -76,6 +76,7 @@ class BMimeType {
     status_t GetLongDescription(char* description) const;
     status_t SetLongDescription(const char* description);
 
+    // Kept for other programs; types are guessed by the desktop's rules.
     status_t GetSnifferRule(BString* rule) const;
     status_t SetSnifferRule(const char* rule);
 
