@@ -2,6 +2,16 @@
 
 #include <chrono>
 
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+bigtime_t microseconds_left(Clock::time_point start) {
+    return std::chrono::duration_cast<std::chrono::microseconds>(Clock::time_point::max() - start).count();
+}
+
+} // namespace
+
 BLocker::BLocker() : BLocker("some BLocker") {}
 
 BLocker::BLocker(const char* name) : mName(name != nullptr ? name : "") {}
@@ -27,27 +37,24 @@ status_t BLocker::LockWithTimeout(bigtime_t timeout) {
         return B_OK;
     }
 
-    using Clock = std::chrono::steady_clock;
-    const Clock::time_point now = Clock::now();
-    // A time-out beyond the clock's range is as good as none.
-    const bool forEver =
-        timeout >=
-        std::chrono::duration_cast<std::chrono::microseconds>(Clock::time_point::max() - now).count();
-    const Clock::time_point deadline =
-        forEver ? Clock::time_point::max() : now + std::chrono::microseconds(max_c(timeout, 0));
-
     GuardLock guard(mMutex);
-    while (mOwner.load(std::memory_order_relaxed) != 0) {
+    if (mOwner.load(std::memory_order_relaxed) != 0) {
         if (timeout <= 0)
             return B_WOULD_BLOCK;
+        const Clock::time_point start = Clock::now();
+        // A time-out beyond the clock's range is as good as none.
+        const bool forEver = timeout > microseconds_left(start);
+        const Clock::time_point deadline = forEver ? start : start + std::chrono::microseconds(timeout);
         mWaiting++;
         std::cv_status waited = std::cv_status::no_timeout;
-        if (forEver)
-            mReleased.wait(guard.Native());
-        else
-            waited = mReleased.wait_until(guard.Native(), deadline);
+        while (mOwner.load(std::memory_order_relaxed) != 0 && waited == std::cv_status::no_timeout) {
+            if (forEver)
+                mReleased.wait(guard.Native());
+            else
+                waited = mReleased.wait_until(guard.Native(), deadline);
+        }
         mWaiting--;
-        if (waited == std::cv_status::timeout && mOwner.load(std::memory_order_relaxed) != 0)
+        if (mOwner.load(std::memory_order_relaxed) != 0)
             return B_TIMED_OUT;
     }
     mOwner.store(self, std::memory_order_relaxed);

@@ -135,17 +135,19 @@ TEST(ThreadTest, SeveralMayWaitForOne) {
     std::atomic<bool> end{false};
     const thread_id thread = spawn_thread(end_when_told, "popular", B_NORMAL_PRIORITY, &end);
     std::atomic<int> sum{0};
+    std::atomic<int> begun{0};
     std::vector<std::thread> waiting;
     for (int number = 0; number < 4; number++) {
-        waiting.emplace_back([&sum, thread] {
+        waiting.emplace_back([&sum, &begun, thread] {
             status_t status = 0;
+            begun++;
             if (wait_for_thread(thread, &status) == B_OK)
                 sum += status;
         });
     }
-    while (resume_thread(thread) != B_BAD_THREAD_STATE)
+    while (begun < 4)
         snooze(100);
-    snooze(20000);
+    snooze(100000);
     end = true;
     for (std::thread& waiter : waiting)
         waiter.join();
