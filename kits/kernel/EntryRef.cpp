@@ -2,6 +2,7 @@
 
 #include <cstdlib>
 #include <cstring>
+#include <utility>
 
 entry_ref::entry_ref() : device(static_cast<dev_t>(-1)), directory(static_cast<ino_t>(-1)), name(nullptr) {}
 
@@ -10,6 +11,9 @@ entry_ref::entry_ref(dev_t dev, ino_t dir, const char* leaf) : device(dev), dire
 }
 
 entry_ref::entry_ref(const entry_ref& other) : entry_ref(other.device, other.directory, other.name) {}
+
+entry_ref::entry_ref(entry_ref&& other) noexcept
+    : device(other.device), directory(other.directory), name(std::exchange(other.name, nullptr)) {}
 
 entry_ref::~entry_ref() {
     std::free(name);
@@ -20,6 +24,16 @@ entry_ref& entry_ref::operator=(const entry_ref& other) {
         device = other.device;
         directory = other.directory;
         set_name(other.name);
+    }
+    return *this;
+}
+
+entry_ref& entry_ref::operator=(entry_ref&& other) noexcept {
+    if (this != &other) {
+        device = other.device;
+        directory = other.directory;
+        std::free(name);
+        name = std::exchange(other.name, nullptr);
     }
     return *this;
 }

@@ -14,8 +14,11 @@ struct entry_ref {
     // `name` is copied and may be null.
     entry_ref(dev_t dev, ino_t dir, const char* name);
     entry_ref(const entry_ref& other);
+    // Leaves the other one without a name.
+    entry_ref(entry_ref&& other) noexcept;
     ~entry_ref();
     entry_ref& operator=(const entry_ref& other);
+    entry_ref& operator=(entry_ref&& other) noexcept;
 
     // Copies the name; null takes it away. B_OK, or B_NO_MEMORY with the old name kept.
     status_t set_name(const char* name);

@@ -76,7 +76,8 @@ typedef struct {
 
 // Makes a thread that will call function(data) once resume_thread() starts it; what the function returns is
 // the thread's exit status. The name is cut to B_OS_NAME_LENGTH - 1 bytes (the system's own tools show 15 of
-// them). `data` stays the caller's. The id, or B_BAD_VALUE for a null function, or B_NO_MORE_THREADS.
+// them). `data` stays the caller's. The id, or B_BAD_VALUE for a null function. Takes nothing of the system's
+// before it is started.
 [[nodiscard]] thread_id spawn_thread(thread_func function, const char* name, int32 priority, void* data);
 
 // Starts a thread that has been spawned. B_BAD_THREAD_STATE when it has been started already,

@@ -181,6 +181,8 @@ status_t send_data(thread_id thread, int32 code, const void* buffer, size_t size
     if (record == nullptr)
         return B_BAD_THREAD_ID;
     std::vector<char> bytes;
+    if (size > PTRDIFF_MAX)
+        return B_NO_MEMORY;
     try {
         const char* const first = static_cast<const char*>(buffer);
         bytes.assign(first, first + size);

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 #include <string>
+#include <utility>
 
 TEST(EntryRefTest, ADefaultRefNamesNothing) {
     const entry_ref ref;
@@ -32,6 +33,17 @@ TEST(EntryRefTest, CopiesAreIndependent) {
     const entry_ref& itself = assigned;
     assigned = itself;
     EXPECT_STREQ(assigned.name, "a");
+}
+
+TEST(EntryRefTest, MovingTakesTheNameAlong) {
+    entry_ref ref(1, 2, "moved");
+    entry_ref target(std::move(ref));
+    EXPECT_STREQ(target.name, "moved");
+    EXPECT_EQ(target.directory, 2U);
+    entry_ref assigned(9, 9, "old");
+    assigned = std::move(target);
+    EXPECT_STREQ(assigned.name, "moved");
+    EXPECT_EQ(assigned.device, 1U);
 }
 
 TEST(EntryRefTest, SettingItsOwnNameOrNone) {

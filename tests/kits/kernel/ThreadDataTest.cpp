@@ -134,6 +134,7 @@ TEST(ThreadDataTest, AReceivingThreadIsShownSo) {
 
 TEST(ThreadDataTest, RefusesWhatMakesNoSense) {
     EXPECT_EQ(send_data(find_thread(nullptr), 1, nullptr, 4), B_BAD_VALUE);
+    EXPECT_EQ(send_data(find_thread(nullptr), 1, "", SIZE_MAX), B_NO_MEMORY);
     EXPECT_EQ(send_data(0, 1, nullptr, 0), B_BAD_THREAD_ID);
     EXPECT_EQ(send_data(INT32_MAX, 1, nullptr, 0), B_BAD_THREAD_ID);
     EXPECT_EQ(has_data(0), B_BAD_THREAD_ID);
