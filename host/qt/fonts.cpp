@@ -223,7 +223,14 @@ std::vector<FontStyle> font_styles(std::string_view family) {
 }
 
 bool family_is_fixed_width(std::string_view family) {
-    return fonts_available() && QFontDatabase::isFixedPitch(QString::fromStdString(resolve_family(family)));
+    if (!fonts_available()) {
+        return family == default_fixed_family;
+    }
+    // Measured, because fonts with letters of double width do not call themselves fixed.
+    FontSpec spec;
+    spec.family = family;
+    const QFontMetricsF metrics(to_font(spec));
+    return metrics.horizontalAdvance(u'i') == metrics.horizontalAdvance(u'W');
 }
 
 std::string resolve_family(std::string_view family) {
