@@ -118,16 +118,12 @@ status_t rename_thread(thread_id thread, const char* newName);
 // priorities.
 status_t set_thread_priority(thread_id thread, int32 newPriority);
 
-// `size` is sizeof(thread_info). B_BAD_VALUE for null or another size, B_BAD_THREAD_ID.
-status_t _get_thread_info(thread_id thread, thread_info* info, size_t size);
+// B_BAD_VALUE for null, B_BAD_THREAD_ID.
+status_t get_thread_info(thread_id thread, thread_info* info);
 // The threads of this process one after the other in the order of their ids; `team` is 0 or this process, and
 // `cookie` begins as 0. B_BAD_VALUE after the last one, B_BAD_TEAM_ID for another process. Threads that the
 // kits did not make appear once they have called the kernel kit.
-status_t _get_next_thread_info(team_id team, int32* cookie, thread_info* info, size_t size);
-
-#define get_thread_info(thread, info) _get_thread_info((thread), (info), sizeof(*(info)))
-#define get_next_thread_info(team, cookie, info)                                                             \
-    _get_next_thread_info((team), (cookie), (info), sizeof(*(info)))
+status_t get_next_thread_info(team_id team, int32* cookie, thread_info* info);
 
 // Every thread has one slot for a message: a code and a copy of `size` bytes.
 // send_data() fills it and waits while it is still full. B_BAD_THREAD_ID for a thread that is unknown, has
@@ -185,8 +181,7 @@ status_t release_sem(sem_id sem);
 // B_RELEASE_IF_WAITING_ONLY never lets the count rise above 0.
 status_t release_sem_etc(sem_id sem, int32 count, uint32 flags);
 status_t get_sem_count(sem_id sem, int32* count);
-status_t _get_sem_info(sem_id sem, sem_info* info, size_t size);
-#define get_sem_info(sem, info) _get_sem_info((sem), (info), sizeof(*(info)))
+status_t get_sem_info(sem_id sem, sem_info* info);
 
 typedef struct port_info {
     port_id port;
@@ -199,7 +194,7 @@ typedef struct port_info {
 } port_info;
 
 inline constexpr int32 B_PORT_MAX_CAPACITY = 4096;
-inline constexpr size_t B_PORT_MAX_MESSAGE_SIZE = 256 * 1024;
+inline constexpr size_t B_PORT_MAX_MESSAGE_SIZE = size_t{256} * 1024;
 
 // A queue of at most `capacity` messages (a code and bytes each), within this process. The id, or B_BAD_VALUE
 // for a capacity outside 1..B_PORT_MAX_CAPACITY.
@@ -226,8 +221,7 @@ status_t close_port(port_id port);
 status_t delete_port(port_id port);
 // Ports belong to this process: B_BAD_TEAM_ID for any other team.
 status_t set_port_owner(port_id port, team_id team);
-status_t _get_port_info(port_id port, port_info* info, size_t size);
-#define get_port_info(port, info) _get_port_info((port), (info), sizeof(*(info)))
+status_t get_port_info(port_id port, port_info* info);
 
 inline constexpr team_id B_CURRENT_TEAM = 0;
 
@@ -246,8 +240,7 @@ typedef struct {
 } team_info;
 
 // This process alone: B_BAD_TEAM_ID for another.
-status_t _get_team_info(team_id team, team_info* info, size_t size);
-#define get_team_info(team, info) _get_team_info((team), (info), sizeof(*(info)))
+status_t get_team_info(team_id team, team_info* info);
 
 typedef struct {
     bigtime_t boot_time;

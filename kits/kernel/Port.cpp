@@ -181,8 +181,8 @@ status_t set_port_owner(port_id port, team_id team) {
     return team == B_CURRENT_TEAM || team == host::current_process() ? B_OK : B_BAD_TEAM_ID;
 }
 
-status_t _get_port_info(port_id id, port_info* info, size_t size) {
-    if (info == nullptr || size != sizeof(port_info))
+status_t get_port_info(port_id id, port_info* info) {
+    if (info == nullptr)
         return B_BAD_VALUE;
     const std::shared_ptr<Port> port = ports().Find(id);
     if (port == nullptr)

@@ -146,8 +146,8 @@ status_t get_sem_count(sem_id sem, int32* count) {
     return B_OK;
 }
 
-status_t _get_sem_info(sem_id sem, sem_info* info, size_t size) {
-    if (info == nullptr || size != sizeof(sem_info))
+status_t get_sem_info(sem_id sem, sem_info* info) {
+    if (info == nullptr)
         return B_BAD_VALUE;
     const std::shared_ptr<Semaphore> semaphore = semaphores().Find(sem);
     if (semaphore == nullptr)

@@ -8,8 +8,8 @@
 #include <cstdio>
 #include <cstdlib>
 
-status_t _get_team_info(team_id team, team_info* info, size_t size) {
-    if (info == nullptr || size != sizeof(team_info))
+status_t get_team_info(team_id team, team_info* info) {
+    if (info == nullptr)
         return B_BAD_VALUE;
     if (team != B_CURRENT_TEAM && team != host::current_process())
         return B_BAD_TEAM_ID;

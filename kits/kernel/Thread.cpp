@@ -148,8 +148,8 @@ status_t set_thread_priority(thread_id thread, int32 newPriority) {
     return std::exchange(record->priority, newPriority);
 }
 
-status_t _get_thread_info(thread_id thread, thread_info* info, size_t size) {
-    if (info == nullptr || size != sizeof(thread_info))
+status_t get_thread_info(thread_id thread, thread_info* info) {
+    if (info == nullptr)
         return B_BAD_VALUE;
     if (thread == current_thread_identity())
         current_thread_record();
@@ -160,8 +160,8 @@ status_t _get_thread_info(thread_id thread, thread_info* info, size_t size) {
     return B_OK;
 }
 
-status_t _get_next_thread_info(team_id team, int32* cookie, thread_info* info, size_t size) {
-    if (cookie == nullptr || info == nullptr || size != sizeof(thread_info))
+status_t get_next_thread_info(team_id team, int32* cookie, thread_info* info) {
+    if (cookie == nullptr || info == nullptr)
         return B_BAD_VALUE;
     if (team != B_CURRENT_TEAM && team != host::current_process())
         return B_BAD_TEAM_ID;

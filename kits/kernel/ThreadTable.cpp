@@ -180,7 +180,7 @@ ThreadRecord* known_current_thread_record() {
     return tRecord;
 }
 
-void run_thread(std::shared_ptr<ThreadRecord> record) {
+void run_thread(const std::shared_ptr<ThreadRecord>& record) {
     adopt_thread_identity(record->id);
     tRecord = record.get();
     {

@@ -102,7 +102,7 @@ ThreadRecord* current_thread_record();
 ThreadRecord* known_current_thread_record();
 
 // What a started thread runs.
-void run_thread(std::shared_ptr<ThreadRecord> record);
+void run_thread(const std::shared_ptr<ThreadRecord>& record);
 
 // Thrown by exit_thread() through a spawned thread's function to run_thread().
 struct ThreadExit {

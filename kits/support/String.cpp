@@ -107,16 +107,16 @@ BString& BString::SetTo(char c, int32 count) {
 BString& BString::SetToFormat(const char* format, ...) {
     va_list arguments;
     va_start(arguments, format);
-    va_list counted;
-    va_copy(counted, arguments);
-    const int length = std::vsnprintf(nullptr, 0, format, counted);
-    va_end(counted);
-    if (length >= 0) {
-        std::string text(static_cast<size_t>(length), '\0');
-        std::vsnprintf(text.data(), text.size() + 1, format, arguments);
-        mText = std::move(text);
-    }
+    const int length = std::vsnprintf(nullptr, 0, format, arguments);
     va_end(arguments);
+    if (length < 0)
+        return *this;
+    // The arguments may point into this string, which therefore changes last.
+    std::string text(static_cast<size_t>(length), '\0');
+    va_start(arguments, format);
+    std::vsnprintf(text.data(), text.size() + 1, format, arguments);
+    va_end(arguments);
+    mText = std::move(text);
     return *this;
 }
 

@@ -112,9 +112,8 @@ TEST(ThreadTest, RefusesWhatMakesNoSense) {
     EXPECT_EQ(rename_thread(find_thread(nullptr), nullptr), B_BAD_VALUE);
     thread_info info;
     int32 cookie = 0;
-    EXPECT_EQ(_get_thread_info(find_thread(nullptr), nullptr, sizeof(info)), B_BAD_VALUE);
-    EXPECT_EQ(_get_thread_info(find_thread(nullptr), &info, 4), B_BAD_VALUE);
-    EXPECT_EQ(_get_next_thread_info(0, nullptr, &info, sizeof(info)), B_BAD_VALUE);
+    EXPECT_EQ(get_thread_info(find_thread(nullptr), nullptr), B_BAD_VALUE);
+    EXPECT_EQ(get_next_thread_info(0, nullptr, &info), B_BAD_VALUE);
     EXPECT_EQ(get_next_thread_info(getpid() + 1, &cookie, &info), B_BAD_TEAM_ID);
 }
 
