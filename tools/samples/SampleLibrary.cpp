@@ -103,8 +103,8 @@ Sample LargeLibrarySong(std::size_t number) {
     return song;
 }
 
-std::string WriteLargeLibrary(const std::string& root, std::size_t count) {
-    const std::string bytes = Frames({11, 1});
+std::string WriteLargeLibrary(const std::string& root, std::size_t count, const SongContent& content) {
+    const std::string frames = Frames({11, content.frames});
     std::error_code error;
     std::string made;
     for (std::size_t number = 0; number < count; ++number) {
@@ -115,6 +115,11 @@ std::string WriteLargeLibrary(const std::string& root, std::size_t count) {
             if (error)
                 return "cannot make " + folder.string() + ": " + error.message();
             made = song.folder;
+        }
+        std::string bytes = frames;
+        if (content.tags == Tags::before) {
+            const std::string title = song.name.substr(5, song.name.size() - 9);
+            bytes.insert(0, Id3v2Tag(title, song.folder.substr(0, song.folder.find('/'))));
         }
         if (std::string problem = WriteFile(folder / song.name, bytes); !problem.empty())
             return problem;

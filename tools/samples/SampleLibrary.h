@@ -24,9 +24,16 @@ const std::vector<Sample>& SmallLibrary();
 /// Answers an empty text, or what went wrong.
 std::string WriteSmallLibrary(const std::string& root);
 
-/// Writes `count` one-frame songs, without tags or attributes, twelve to an album folder, ten albums to an
-/// artist folder. The same names for the same count. Answers an empty text, or what went wrong.
-std::string WriteLargeLibrary(const std::string& root, std::size_t count);
+/// What a song of the large library holds besides its name.
+struct SongContent {
+    int frames = 1; ///< of 26 ms, 104 bytes each
+    Sample::Tags tags = Sample::Tags::none;
+};
+
+/// Writes `count` songs without attributes, twelve to an album folder, ten albums to an artist folder. The
+/// same names for the same count; tags inside the files hold what the names say. Answers an empty text, or
+/// what went wrong.
+std::string WriteLargeLibrary(const std::string& root, std::size_t count, const SongContent& content = {});
 
 /// Folder and leaf name of song `number` of the large library.
 Sample LargeLibrarySong(std::size_t number);

@@ -7,16 +7,24 @@
 
 int main(int argc, char** argv) {
     char* end = nullptr;
-    const unsigned long long count = argc == 3 ? std::strtoull(argv[2], &end, 10) : 0;
-    if (argc < 2 || argc > 3 || (argc == 3 && (count == 0 || *end != '\0'))) {
-        std::fprintf(stderr, "usage: sample-library FOLDER [COUNT]\n"
-                             "Writes MP3 files below FOLDER: a small collection of every style of name,\n"
-                             "or COUNT songs in album folders.\n");
+    const unsigned long long count = argc >= 3 ? std::strtoull(argv[2], &end, 10) : 0;
+    const bool bad_count = argc >= 3 && (count == 0 || *end != '\0');
+    samples::SongContent content;
+    if (argc == 4) {
+        content.frames = static_cast<int>(std::strtol(argv[3], &end, 10));
+        content.tags = samples::Sample::Tags::before;
+    }
+    if (argc < 2 || argc > 4 || bad_count || (argc == 4 && (content.frames <= 0 || *end != '\0'))) {
+        std::fprintf(
+            stderr,
+            "usage: sample-library FOLDER [COUNT [FRAMES]]\n"
+            "Writes MP3 files below FOLDER: a small collection of every style of name, or COUNT songs in\n"
+            "album folders, of one frame without tags inside, or of FRAMES frames with them.\n");
         return 2;
     }
-    const std::string problem = argc == 3
-                                    ? samples::WriteLargeLibrary(argv[1], static_cast<std::size_t>(count))
-                                    : samples::WriteSmallLibrary(argv[1]);
+    const std::string problem =
+        argc >= 3 ? samples::WriteLargeLibrary(argv[1], static_cast<std::size_t>(count), content)
+                  : samples::WriteSmallLibrary(argv[1]);
     if (!problem.empty()) {
         std::fprintf(stderr, "sample-library: %s\n", problem.c_str());
         return 1;

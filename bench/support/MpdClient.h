@@ -1,0 +1,30 @@
+#pragma once
+
+#include <string>
+
+namespace bench {
+
+/// A Music Player Daemon of the benchmark's own, started and stopped by bench/peers/mpd, and one connection
+/// to it.
+class MpdClient {
+  public:
+    MpdClient(std::string script, std::string folder);
+    ~MpdClient();
+    MpdClient(const MpdClient&) = delete;
+    MpdClient& operator=(const MpdClient&) = delete;
+
+    /// Starts it on the library and waits for its first update. An empty text, or why there is none.
+    std::string Start(const std::string& library);
+    double FirstUpdateSeconds() const { return mSeconds; }
+
+    /// The answer to count "(any contains 'TEXT')" over the connection; TEXT without quotes and backslashes.
+    std::size_t CountSongs(const std::string& text);
+
+  private:
+    const std::string mScript;
+    const std::string mFolder;
+    double mSeconds = 0;
+    int mConnection = -1;
+};
+
+} // namespace bench
