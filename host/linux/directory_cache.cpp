@@ -332,9 +332,6 @@ std::size_t DirectoryCache::open_count() const {
 void DirectoryCache::start_janitor() {
     if (janitor_runs_ || ending_)
         return;
-    // The former one has found nothing to do and touches nothing any more.
-    if (janitor_.joinable())
-        janitor_.join();
     janitor_runs_ = true;
     janitor_ = std::thread([this] { run_janitor(); });
 }
@@ -359,6 +356,9 @@ void DirectoryCache::run_janitor() {
         }
         if (ending_ || (!more && closed.empty())) {
             janitor_runs_ = false;
+            // Nobody joins it then, unless the cache is ending and waits.
+            if (janitor_.joinable())
+                janitor_.detach();
             return;
         }
         lock.unlock();

@@ -54,22 +54,21 @@ VolumeWatcher::~VolumeWatcher() {
 
 std::shared_ptr<void> VolumeWatcher::listen(Volumes::Listener listener) {
     auto registration = std::make_shared<Registration>(std::move(listener));
+    // Looked at here: whatever changes after this call is news.
+    auto known = table_.refresh();
     MutexLock lock(mutex_);
     registrations_.push_back(registration);
-    start();
+    start(std::move(known));
     return std::shared_ptr<void>(registration.get(),
                                  [this](void* token) { remove(static_cast<Registration*>(token)); });
 }
 
-void VolumeWatcher::start() {
+void VolumeWatcher::start(std::shared_ptr<const VolumeSnapshot> known) {
     if (running_)
         return;
-    // The former thread has found no listeners and is past its last use of this object's state.
-    if (thread_.joinable())
-        thread_.join();
     wake_ = Descriptor(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK));
     running_ = true;
-    thread_ = std::thread([this] { run(); });
+    thread_ = std::thread([this, known = std::move(known)] { run(known); });
 }
 
 void VolumeWatcher::remove(Registration* registration) {
@@ -100,20 +99,21 @@ void VolumeWatcher::tell(Volumes::Change change, const VolumeInfo& info) {
     }
 }
 
-void VolumeWatcher::run() {
+void VolumeWatcher::run(std::shared_ptr<const VolumeSnapshot> known) {
     const Descriptor mounts(::open("/proc/self/mountinfo", O_RDONLY | O_CLOEXEC));
-    auto known = table_.refresh();
     for (;;) {
         int wake = -1;
         {
             MutexLock lock(mutex_);
             if (registrations_.empty()) {
                 running_ = false;
+                // Nobody joins it then, unless this object is ending and waits.
+                if (thread_.joinable())
+                    thread_.detach();
                 return;
             }
             wake = wake_.get();
         }
-        wait_for_change(mounts.get(), wake);
         const auto now = table_.refresh();
         for (const Volume& volume : known->volumes()) {
             if (now->find(volume.info.id) == nullptr)
@@ -124,6 +124,7 @@ void VolumeWatcher::run() {
                 tell(Volumes::Change::mounted, volume.info);
         }
         known = now;
+        wait_for_change(mounts.get(), wake);
     }
 }
 

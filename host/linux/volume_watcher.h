@@ -9,6 +9,7 @@
 
 namespace host {
 
+class VolumeSnapshot;
 class VolumeTable;
 
 /// Tells listeners of volumes that come and go. Its thread runs while there are listeners; it sleeps until
@@ -24,9 +25,9 @@ class VolumeWatcher {
   private:
     class Registration;
 
-    void run();
+    void run(std::shared_ptr<const VolumeSnapshot> known);
     void wait_for_change(int mounts, int wake);
-    void start() REQUIRES(mutex_);
+    void start(std::shared_ptr<const VolumeSnapshot> known) REQUIRES(mutex_);
     void remove(Registration* registration);
     void tell(Volumes::Change change, const VolumeInfo& info);
 
