@@ -1,0 +1,70 @@
+// BApplication: the looper that stands for the whole program.
+#pragma once
+
+#include <Looper.h>
+#include <Messenger.h>
+
+class BList;
+class BMessageRunner;
+struct app_info;
+
+// One for each program, made in main() before all other loopers and deleted there after Run(); Quit() does
+// not delete it. Making it also makes the directory for settings.
+class BApplication : public BLooper {
+  public:
+    // A MIME type "application/x-vnd....". Without a valid one (`error` then receives B_BAD_VALUE) the
+    // program is told so on standard error and ended; with `error` it goes on with an object that cannot
+    // Run().
+    explicit BApplication(const char* signature);
+    BApplication(const char* signature, status_t* error);
+    explicit BApplication(BMessage* from);
+    ~BApplication() override;
+
+    static BArchivable* Instantiate(BMessage* from);
+    status_t Archive(BMessage* into, bool deep = true) const override;
+    status_t InitCheck() const;
+
+    // The application's messages are handled in a thread of their own until Quit(); this thread runs the
+    // main loop (MainLoop.h) or waits. Returns that thread's id when all is over.
+    thread_id Run() override;
+    // Ends Run(), in any thread.
+    void Quit() override;
+    bool QuitRequested() override;
+
+    // Hooks, called in the application's thread.
+    virtual void ReadyToRun();
+    virtual void ArgvReceived(int32 argc, char** argv);
+    virtual void RefsReceived(BMessage* message);
+    virtual void AppActivated(bool active);
+    virtual void AboutRequested();
+    // Every SetPulseRate() microseconds; 0, as at first, for never.
+    virtual void Pulse();
+    void SetPulseRate(bigtime_t rate);
+
+    void MessageReceived(BMessage* message) override;
+    void DispatchMessage(BMessage* message, BHandler* handler) override;
+    BHandler* ResolveSpecifier(BMessage* message, int32 index, BMessage* specifier, int32 form,
+                               const char* property) override;
+    status_t GetSupportedSuites(BMessage* data) override;
+
+    // All loopers of the program, the application first. A looper may be gone before the caller looks at it.
+    int32 CountLoopers() const;
+    BLooper* LooperAt(int32 index) const;
+    // True until the thread runs.
+    bool IsLaunching() const;
+    const char* Signature() const;
+    bool HasSignature(const char* signature) const;
+    status_t GetAppInfo(app_info* info) const;
+
+  private:
+    void Initialise(const char* signature);
+    static int32 ThreadEntry(void* application);
+
+    std::string mSignature;
+    status_t mInitStatus = B_OK;
+    std::atomic<bool> mReadyToRunCalled{false};
+    std::unique_ptr<BMessageRunner> mPulse;
+};
+
+// The program's application; null while there is none.
+extern BApplication* be_app;

@@ -1,0 +1,20 @@
+// What the main thread does while the application runs. Internal to the kits.
+#pragma once
+
+// Installed by whoever needs the main thread for itself (the windowing part); without one the main thread
+// just waits for the application's looper to end.
+class MainLoop {
+  public:
+    virtual ~MainLoop() = default;
+
+    // Called in the thread that called BApplication::Run(). Returns after Quit(), also when that came first.
+    // False when it cannot work (no display); the reason has been printed then, and the application's
+    // Run() ends the process with exit status 1.
+    virtual bool Run() = 0;
+    // Called once, from the application's looper thread, as it ends.
+    virtual void Quit() = 0;
+};
+
+// Before BApplication::Run(); the loop must outlive it. Null takes it away.
+void set_main_loop(MainLoop* loop);
+MainLoop* main_loop();

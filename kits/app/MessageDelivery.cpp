@@ -1,0 +1,170 @@
+#include "MessageDelivery.h"
+
+#include "ReplyBox.h"
+#include "TokenTable.h"
+
+#include <atomic>
+#include <utility>
+
+namespace {
+
+team_id ThisTeam() {
+    static const team_id team = [] {
+        team_info info;
+        return get_team_info(B_CURRENT_TEAM, &info) == B_OK ? info.team : 0;
+    }();
+    return team;
+}
+
+std::atomic<int32> sDefaultReplyToken{0};
+
+// Replies that nobody asked for elsewhere go to the application.
+MessengerAddress ReplyAddress(const MessengerAddress& replyTo) {
+    const int32 token = sDefaultReplyToken;
+    if (replyTo.token != 0 || token == 0)
+        return replyTo;
+    return {ThisTeam(), token, true};
+}
+
+// A reply box under its token, for as long as somebody waits at it.
+class RegisteredReplyBox {
+  public:
+    RegisteredReplyBox()
+        : box(std::make_shared<ReplyBox>()), mToken(TokenTable::Instance().AddReplyBox(box)) {}
+    ~RegisteredReplyBox() { TokenTable::Instance().Remove(mToken); }
+    RegisteredReplyBox(const RegisteredReplyBox&) = delete;
+    RegisteredReplyBox& operator=(const RegisteredReplyBox&) = delete;
+
+    MessengerAddress Address() const { return {ThisTeam(), mToken, false}; }
+
+    const std::shared_ptr<ReplyBox> box;
+
+  private:
+    const int32 mToken;
+};
+
+} // namespace
+
+bool MessageDelivery::IsThisTeam(team_id team) {
+    return team == ThisTeam();
+}
+
+void MessageDelivery::SetDefaultReplyTarget(int32 looperToken) {
+    sDefaultReplyToken = looperToken;
+}
+
+MessengerAddress MessageDelivery::LocalAddress(int32 token, bool preferred) {
+    return {ThisTeam(), token, preferred};
+}
+
+void MessageDelivery::SetTarget(BMessage& message, int32 token, bool preferred) {
+    message.mDelivery.target = {ThisTeam(), token, preferred};
+}
+
+void MessageDelivery::MarkDropped(BMessage& message, BPoint where, BPoint offset) {
+    message.mDelivery.dropped = true;
+    message.mDelivery.dropPoint = where;
+    message.mDelivery.dropOffset = offset;
+}
+
+std::unique_ptr<BMessage> MessageDelivery::Address(const BMessage& message, const MessengerAddress& target,
+                                                   const MessengerAddress& replyTo, Waiting waiting) {
+    auto copy = std::make_unique<BMessage>(message);
+    BMessage::Delivery& delivery = copy->mDelivery;
+    delivery.delivered = true;
+    delivery.sourceWaiting = waiting == Waiting::forReply;
+    delivery.target = target;
+    delivery.replyTo = replyTo;
+    // A dropped message that is passed on stays one.
+    delivery.dropped = message.mDelivery.dropped;
+    delivery.dropPoint = message.mDelivery.dropPoint;
+    delivery.dropOffset = message.mDelivery.dropOffset;
+    return copy;
+}
+
+status_t MessageDelivery::SendAddressed(std::unique_ptr<BMessage> message, bigtime_t timeout) {
+    const MessengerAddress target = message->mDelivery.target;
+    status_t status = B_BAD_PORT_ID;
+    if (target.token != 0 && !IsThisTeam(target.team)) {
+        status = B_BAD_TEAM_ID;
+    } else if (const std::shared_ptr<ReplyBox> box = TokenTable::Instance().FindReplyBox(target.token)) {
+        return box->Put(std::move(message));
+    } else if (const TokenTable::Target found = TokenTable::Instance().Find(target.token); found.looper) {
+        // Null once the looper has taken it, also when that has failed.
+        return found.looper->Deliver(std::move(message), timeout);
+    }
+    // It never left, so it does not answer for its handler as it goes away.
+    message->mDelivery.sourceWaiting = false;
+    return status;
+}
+
+status_t MessageDelivery::Send(const BMessage& message, const MessengerAddress& target,
+                               const MessengerAddress& replyTo, bigtime_t timeout) {
+    return SendAddressed(Address(message, target, ReplyAddress(replyTo), Waiting::none), timeout);
+}
+
+status_t MessageDelivery::Post(const BMessage& message, LooperState& looper, int32 target,
+                               const MessengerAddress& replyTo) {
+    const MessengerAddress address{ThisTeam(), target, target == 0};
+    return looper.Post(Address(message, address, ReplyAddress(replyTo), Waiting::none));
+}
+
+status_t MessageDelivery::SendAndWait(const BMessage& message, const MessengerAddress& target,
+                                      BMessage* reply, bigtime_t deliveryTimeout, bigtime_t replyTimeout) {
+    if (reply == nullptr)
+        return B_BAD_VALUE;
+    const TokenTable::Target found = TokenTable::Instance().Find(target.token);
+    if (IsThisTeam(target.team) && found.looper && found.looper->thread == current_thread_identity())
+        return B_MESSAGE_TO_SELF;
+    RegisteredReplyBox waiting;
+    status_t status =
+        SendAddressed(Address(message, target, waiting.Address(), Waiting::forReply), deliveryTimeout);
+    std::unique_ptr<BMessage> answer;
+    if (status == B_OK)
+        status = waiting.box->Wait(replyTimeout, &answer);
+    if (status != B_OK)
+        return status;
+    *reply = *answer;
+    // The reply may be answered in turn, and knows what it replies to; only its addressee changes objects.
+    reply->mDelivery = answer->mDelivery;
+    answer->mDelivery.sourceWaiting = false;
+    return B_OK;
+}
+
+status_t MessageDelivery::Reply(BMessage& request, const BMessage& reply, const MessengerAddress& replyTo,
+                                bigtime_t timeout) {
+    if (!request.mDelivery.delivered || request.mDelivery.replyTo.token == 0)
+        return B_BAD_REPLY;
+    if (request.mDelivery.sourceWaiting && request.mDelivery.replied)
+        return B_DUPLICATE_REPLY;
+    std::unique_ptr<BMessage> copy =
+        Address(reply, request.mDelivery.replyTo, ReplyAddress(replyTo), Waiting::none);
+    copy->mDelivery.isReply = true;
+    copy->mDelivery.previous = std::make_shared<BMessage>(request);
+    request.mDelivery.replied = true;
+    return SendAddressed(std::move(copy), timeout);
+}
+
+status_t MessageDelivery::ReplyAndWait(BMessage& request, const BMessage& reply, BMessage* replyToReply,
+                                       bigtime_t sendTimeout, bigtime_t replyTimeout) {
+    if (!request.mDelivery.delivered || request.mDelivery.replyTo.token == 0)
+        return B_BAD_REPLY;
+    if (request.mDelivery.sourceWaiting && request.mDelivery.replied)
+        return B_DUPLICATE_REPLY;
+    RegisteredReplyBox waiting;
+    std::unique_ptr<BMessage> copy =
+        Address(reply, request.mDelivery.replyTo, waiting.Address(), Waiting::forReply);
+    copy->mDelivery.isReply = true;
+    copy->mDelivery.previous = std::make_shared<BMessage>(request);
+    request.mDelivery.replied = true;
+    status_t status = SendAddressed(std::move(copy), sendTimeout);
+    std::unique_ptr<BMessage> answer;
+    if (status == B_OK)
+        status = waiting.box->Wait(replyTimeout, &answer);
+    if (status != B_OK)
+        return status;
+    *replyToReply = *answer;
+    replyToReply->mDelivery = answer->mDelivery;
+    answer->mDelivery.sourceWaiting = false;
+    return B_OK;
+}
