@@ -1,0 +1,141 @@
+#include "host/sqlite/entry_state.h"
+#include "host/linux/opening.h"
+#include "host/linux/system_calls.h"
+#include "host/sqlite/attribute_value.h"
+#include <cerrno>
+#include <ctime>
+#include <fcntl.h>
+
+namespace host {
+namespace {
+
+constexpr std::int64_t kSecond = 1'000'000'000;
+// Kernels without fine-grained times give all changes within one timer tick (at most 10 ms) the same time.
+constexpr std::int64_t kTick = 10'000'000;
+constexpr int kAttempts = 20;
+// Texts that only a file holds are still compared, up to this length.
+constexpr std::size_t kLongestComparedText = 65536;
+
+} // namespace
+
+std::int64_t change_time_of(const struct stat& status) {
+    return status.st_ctim.tv_sec * kSecond + status.st_ctim.tv_nsec;
+}
+
+Status StateReader::read(int directory, DeviceId device, const char* leaf, EntryState& state) {
+    state.attributes.clear();
+    if (system_calls().fstatat(directory, leaf, &state.status, AT_SYMLINK_NOFOLLOW) != 0)
+        return errno;
+    if (!S_ISREG(state.status.st_mode) && !S_ISDIR(state.status.st_mode))
+        return {};
+    Result<Descriptor> file = open_for_reading(directory, leaf);
+    if (!file)
+        return file.error() == ENOENT ? Status(ENOENT) : Status();
+    if (system_calls().fstat(file->get(), &state.status) != 0)
+        return errno;
+    for (int attempt = 0; attempt < kAttempts; ++attempt) {
+        const std::int64_t before = change_time_of(state.status);
+        state.attributes.clear();
+        timespec now = {};
+        clock_gettime(CLOCK_REALTIME, &now);
+        state.settled = now.tv_sec * kSecond + now.tv_nsec - before > kTick;
+        const Status scanned = scanner_.scan({file->get(), device}, [&](const ScannedAttribute& attribute) {
+            state.attributes.push_back(
+                {std::string(attribute.name), attribute.type,
+                 std::string(reinterpret_cast<const char*>(attribute.bytes.data()), attribute.bytes.size()),
+                 attribute.complete});
+        });
+        if (!scanned.ok())
+            state.attributes.clear();
+        if (system_calls().fstat(file->get(), &state.status) != 0)
+            return errno;
+        if (change_time_of(state.status) == before)
+            return {};
+    }
+    state.settled = false;
+    return {};
+}
+
+void EntrySubject::set_status(const struct stat& status) {
+    status_ = status;
+    status_known_ = Known::yes;
+}
+
+void EntrySubject::set_record(const std::vector<std::byte>& record, const AttributeNames& names) {
+    record_ = &record;
+    names_ = &names;
+}
+
+void EntrySubject::set_state(const EntryState& state) {
+    state_ = &state;
+    set_status(state.status);
+}
+
+bool EntrySubject::look() {
+    if (status_known_ == Known::no)
+        status_known_ =
+            system_calls().fstatat(directory_, std::string(leaf_).c_str(), &status_, AT_SYMLINK_NOFOLLOW) == 0
+                ? Known::yes
+                : Known::failed;
+    return status_known_ == Known::yes;
+}
+
+AttributeValue EntrySubject::size() {
+    return look() ? AttributeValue::of_integer(status_.st_size) : AttributeValue();
+}
+
+AttributeValue EntrySubject::last_modified() {
+    return look() ? AttributeValue::of_integer(status_.st_mtim.tv_sec) : AttributeValue();
+}
+
+bool EntrySubject::open() {
+    if (file_known_ == Known::no) {
+        Result<Descriptor> file = open_for_reading(directory_, std::string(leaf_).c_str());
+        file_known_ = file ? Known::yes : Known::failed;
+        if (file)
+            file_ = std::move(*file);
+    }
+    return file_known_ == Known::yes;
+}
+
+AttributeValue EntrySubject::from_file(const std::string& name) {
+    if (!open())
+        return {};
+    const AttributeFile file = {file_.get(), device_};
+    const Result<AttributeInfo> info = attribute_info(file, name.c_str());
+    if (!info || kind_of_type(info->type) == AttributeValue::Kind::none)
+        return {};
+    auto value = std::make_unique<std::string>(
+        std::min(static_cast<std::size_t>(info->size), kLongestComparedText), '\0');
+    const Result<std::size_t> read = read_attribute(file, name.c_str(), 0, value->data(), value->size());
+    if (!read)
+        return {};
+    value->resize(*read);
+    values_.push_back(std::move(value));
+    return attribute_value(info->type, std::as_bytes(std::span(*values_.back())));
+}
+
+AttributeValue EntrySubject::attribute(const std::string& name) {
+    if (state_ != nullptr) {
+        for (const FileAttribute& attribute : state_->attributes) {
+            if (attribute.name == name)
+                return attribute.complete
+                           ? attribute_value(attribute.type, std::as_bytes(std::span(attribute.bytes)))
+                           : from_file(name);
+        }
+        return {};
+    }
+    if (record_ == nullptr)
+        return from_file(name);
+    RecordReader reader(*record_);
+    RecordedAttribute recorded;
+    while (reader.next(recorded)) {
+        const auto found = names_->find(recorded.id);
+        if (found == names_->end() || found->second.name != name)
+            continue;
+        return recorded.cut ? from_file(name) : attribute_value(found->second.type, recorded.bytes);
+    }
+    return {};
+}
+
+} // namespace host

@@ -1,0 +1,43 @@
+#pragma once
+
+#include "host/api/index.h"
+#include "host/linux/directory_cache.h"
+#include "host/sqlite/condition.h"
+#include "host/sqlite/entry_state.h"
+#include "host/sqlite/live_queries.h"
+#include "host/sqlite/volume_index.h"
+#include <memory>
+#include <unordered_map>
+#include <vector>
+
+namespace host {
+
+/// Answers a bound condition from the rows that the columns found, looking at each file.
+class IndexQuery final : public RunningQuery {
+  public:
+    IndexQuery(std::shared_ptr<VolumeIndex> index, std::shared_ptr<const Condition> condition,
+               std::shared_ptr<LiveQuery> live, std::vector<RowNumber> rows);
+    ~IndexQuery() override;
+
+    Status next(Hit& hit) override;
+    Status rewind() override;
+
+  private:
+    bool is_hit(IndexRow& row, Hit& hit);
+    const Directory* directory_of(std::uint64_t inode);
+
+    const std::shared_ptr<VolumeIndex> index_;
+    const std::shared_ptr<const Condition> condition_;
+    const std::shared_ptr<LiveQuery> live_;
+    std::vector<RowNumber> rows_;
+    std::size_t position_ = 0;
+    std::unique_ptr<IndexStore> reader_;
+    AttributeNames names_;
+    IndexRow row_;
+    /// The directories of recent hits; null: not to be found.
+    std::unordered_map<std::uint64_t, DirectoryCache::Handle> directories_;
+    std::uint64_t last_inode_ = 0;
+    const Directory* last_directory_ = nullptr;
+};
+
+} // namespace host

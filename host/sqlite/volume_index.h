@@ -1,0 +1,115 @@
+#pragma once
+
+#include "host/api/index.h"
+#include "host/api/thread_safety.h"
+#include "host/sqlite/change_queue.h"
+#include "host/sqlite/index_files.h"
+#include "host/sqlite/live_queries.h"
+#include "host/sqlite/row_writer.h"
+#include "host/sqlite/search_columns.h"
+#include <atomic>
+#include <memory>
+#include <set>
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace host {
+
+/// The index of one volume: its database, its writer thread, its columns. docs/index.md tells how they work
+/// together. Any thread.
+class VolumeIndex {
+  public:
+    VolumeIndex(DeviceId device, const std::string& stable_key);
+    /// Commits what is queued and ends the threads.
+    ~VolumeIndex();
+
+    DeviceId device() const { return device_; }
+    const std::string& stable_key() const { return stable_key_; }
+
+    Status create(const std::string& attribute, std::uint32_t type);
+    Status remove(const std::string& attribute);
+    std::vector<IndexInfo> list();
+
+    ChangeTicket attributes_changed(const EntryRef& ref);
+    void entry_changed(const EntryRef& ref);
+    /// A watcher's event, or a walk's finding.
+    void entry_observed(std::uint64_t directory, const std::string& leaf, ChangeNote::Source source);
+
+    /// Rows that may satisfy a bound condition; every one must be looked at. ENOTSUP: the index cannot tell
+    /// now (its database cannot be written or read), so walk.
+    Status search(const Condition& condition, std::vector<RowNumber>& rows);
+
+    /// A connection to the database for reading, from a pool; null when it cannot be opened.
+    std::unique_ptr<IndexStore> borrow_reader();
+    void give_back_reader(std::unique_ptr<IndexStore> reader);
+    /// A reader has met a damaged page.
+    void report_damage();
+
+    LiveQueries& live_queries() { return live_; }
+
+    Status flush();
+    Status reconcile(Indexes::Depth depth, const std::atomic<bool>* cancelled);
+    Status rebuild(const std::function<bool(std::uint64_t)>& progress);
+    /// Reconciles in the background when the last user of the database has not closed it cleanly.
+    void reconcile_after_crash();
+
+    /// There are indices on this volume (made by any process).
+    bool in_use();
+    std::size_t memory_bytes() { return columns_.memory_bytes(); }
+    std::size_t arena_bytes() { return columns_.arena_bytes(); }
+
+  private:
+    enum class Opening { only_existing, create };
+    enum class Looking { changed_only, everything };
+
+    bool open_locked(Opening opening) REQUIRES(mutex_);
+    bool open_store_locked() REQUIRES(mutex_);
+    void start_over_locked() REQUIRES(mutex_);
+    void check_file_locked() REQUIRES(mutex_);
+    void write_groups();
+    bool write_group(std::vector<ChangeNote>& group);
+    void mark_incomplete_locked() REQUIRES(mutex_);
+    bool is_complete();
+    Status walk_volume(Looking looking, const std::atomic<bool>* cancelled,
+                       const std::function<bool(std::uint64_t)>& progress);
+    Status look_at_directories(const std::atomic<bool>* cancelled);
+    void note_directory(IndexStore& reader, std::uint64_t directory, const Directory& opened,
+                        std::vector<std::uint64_t>* subdirectories);
+    void run_background();
+
+    const DeviceId device_;
+    const std::string stable_key_;
+    const IndexFiles files_;
+    QueueCounters counters_;
+    ChangeQueue queue_{counters_};
+    SearchColumns columns_{files_.database()};
+    LiveQueries live_;
+
+    /// Guards the writer's connection; never held while waiting for the queue.
+    Mutex mutex_;
+    IndexStore store_ GUARDED_BY(mutex_);
+    RowWriter writer_ GUARDED_BY(mutex_);
+    std::uint64_t database_inode_ GUARDED_BY(mutex_) = 0;
+    std::vector<ListedIndex> list_ GUARDED_BY(mutex_);
+    std::set<std::string> indexed_ GUARDED_BY(mutex_);
+    bool dirty_ GUARDED_BY(mutex_) = false;
+    /// The database on disk lacks something: until a walk of the whole volume has been committed.
+    bool lost_changes_ GUARDED_BY(mutex_) = false;
+    bool found_unclean_ GUARDED_BY(mutex_) = false;
+    std::thread writer_thread_ GUARDED_BY(mutex_);
+    std::atomic<bool> open_{false};
+
+    Mutex readers_mutex_;
+    std::vector<std::unique_ptr<IndexStore>> readers_ GUARDED_BY(readers_mutex_);
+    std::uint64_t readers_inode_ GUARDED_BY(readers_mutex_) = 0;
+
+    /// One walk at a time.
+    Mutex walk_mutex_;
+    Mutex background_mutex_;
+    std::thread background_ GUARDED_BY(background_mutex_);
+    std::atomic<bool> background_runs_{false};
+    std::atomic<bool> stopping_{false};
+};
+
+} // namespace host

@@ -1,0 +1,151 @@
+#include "host/sqlite/volume_indexes.h"
+#include "host/linux/volume_table.h"
+#include "host/sqlite/index_query.h"
+#include "host/sqlite/walk_query.h"
+#include <cerrno>
+
+namespace host {
+
+VolumeIndexes::~VolumeIndexes() {
+    shut_down();
+}
+
+std::shared_ptr<VolumeIndex> VolumeIndexes::of(DeviceId device) {
+    std::shared_ptr<VolumeIndex> gone;
+    MutexLock lock(mutex_);
+    const auto found = indexes_.find(device);
+    if (found != indexes_.end())
+        return found->second;
+    auto volumes = VolumeTable::instance().current();
+    const Volume* volume = volumes->find(device);
+    if (volume == nullptr) {
+        volumes = VolumeTable::instance().refresh();
+        volume = volumes->find(device);
+    }
+    if (volume == nullptr || !volume->info.knows_queries)
+        return nullptr;
+    return indexes_[device] = std::make_shared<VolumeIndex>(device, volume->stable_key);
+}
+
+Status VolumeIndexes::create(DeviceId device, const std::string& attribute, std::uint32_t type) {
+    const Result<VolumeInfo> info = VolumeTable::instance().info(device);
+    if (!info)
+        return ENODEV;
+    if (info->read_only)
+        return EROFS;
+    const auto index = of(device);
+    return index ? index->create(attribute, type) : Status(ENOTSUP);
+}
+
+Status VolumeIndexes::remove(DeviceId device, const std::string& attribute) {
+    const auto index = of(device);
+    return index ? index->remove(attribute) : Status(ENODEV);
+}
+
+Result<std::vector<IndexInfo>> VolumeIndexes::list(DeviceId device) {
+    const auto index = of(device);
+    if (!index)
+        return Status(VolumeTable::instance().info(device) ? ENOTSUP : ENODEV);
+    constexpr std::uint32_t text = 0x43535452;    // 'CSTR'
+    constexpr std::uint32_t integer = 0x4c4c4e47; // 'LLNG'
+    std::vector<IndexInfo> result(3);
+    result[0].attribute = "name";
+    result[0].type = text;
+    result[1].attribute = "size";
+    result[1].type = integer;
+    result[2].attribute = "last_modified";
+    result[2].type = integer;
+    for (IndexInfo& info : index->list())
+        result.push_back(std::move(info));
+    return result;
+}
+
+Result<std::unique_ptr<RunningQuery>>
+VolumeIndexes::query(DeviceId device, std::shared_ptr<const Predicate> predicate, QueryListener listener) {
+    if (!predicate)
+        return Status(EINVAL);
+    const auto condition = Condition::compile(*predicate);
+    if (!condition)
+        return Status(EINVAL);
+    if (VolumeTable::instance().refresh()->find(device) == nullptr) {
+        std::shared_ptr<VolumeIndex> gone;
+        MutexLock lock(mutex_);
+        if (const auto found = indexes_.find(device); found != indexes_.end()) {
+            gone = std::move(found->second);
+            indexes_.erase(found);
+        }
+        return Status(ENODEV);
+    }
+    const auto index = of(device);
+    std::shared_ptr<LiveQuery> live;
+    if (listener && index) {
+        // What happened before the query began is no update.
+        std::vector<RowNumber> rows;
+        if (condition->bound())
+            (void)index->search(*condition, rows);
+        else
+            (void)index->flush();
+        live = std::make_shared<LiveQuery>(device, condition, std::move(listener));
+        index->live_queries().add(live);
+    }
+    if (index && condition->bound()) {
+        std::vector<RowNumber> rows;
+        const Status found = index->search(*condition, rows);
+        if (found.ok())
+            return std::unique_ptr<RunningQuery>(
+                std::make_unique<IndexQuery>(index, condition, live, std::move(rows)));
+        if (found.error() != ENOTSUP)
+            return found;
+    }
+    auto walker = TreeWalker::open(device);
+    if (!walker)
+        return walker.status();
+    return std::unique_ptr<RunningQuery>(
+        std::make_unique<WalkQuery>(device, condition, live, index, std::move(*walker)));
+}
+
+ChangeTicket VolumeIndexes::attributes_changed(const EntryRef& ref) {
+    const auto index = of(ref.device);
+    return index ? index->attributes_changed(ref) : ChangeTicket();
+}
+
+void VolumeIndexes::entry_changed(const EntryRef& ref) {
+    if (const auto index = of(ref.device))
+        index->entry_changed(ref);
+}
+
+void VolumeIndexes::follow_changes() {
+    for (const DeviceId device : VolumeTable::instance().list()) {
+        if (const auto index = of(device))
+            index->reconcile_after_crash();
+    }
+}
+
+Status VolumeIndexes::reconcile(DeviceId device, Depth depth, const std::atomic<bool>* cancelled) {
+    const auto index = of(device);
+    return index ? index->reconcile(depth, cancelled) : Status(ENODEV);
+}
+
+Status VolumeIndexes::rebuild(DeviceId device, const std::function<bool(std::uint64_t)>& progress) {
+    const auto index = of(device);
+    return index ? index->rebuild(progress) : Status(ENODEV);
+}
+
+Status VolumeIndexes::flush(DeviceId device) {
+    const auto index = of(device);
+    return index ? index->flush() : Status();
+}
+
+void VolumeIndexes::shut_down() {
+    std::map<DeviceId, std::shared_ptr<VolumeIndex>> closing;
+    MutexLock lock(mutex_);
+    closing.swap(indexes_);
+    lock.unlock();
+}
+
+Indexes& indexes() {
+    static VolumeIndexes all;
+    return all;
+}
+
+} // namespace host

@@ -1,0 +1,39 @@
+#pragma once
+
+#include "host/api/index.h"
+#include "host/api/thread_safety.h"
+#include "host/sqlite/volume_index.h"
+#include <atomic>
+#include <map>
+#include <memory>
+#include <thread>
+
+namespace host {
+
+/// The indexes of all volumes. Any thread.
+class VolumeIndexes final : public Indexes {
+  public:
+    ~VolumeIndexes() override;
+
+    Status create(DeviceId volume, const std::string& attribute, std::uint32_t type) override;
+    Status remove(DeviceId volume, const std::string& attribute) override;
+    Result<std::vector<IndexInfo>> list(DeviceId volume) override;
+    Result<std::unique_ptr<RunningQuery>> query(DeviceId volume, std::shared_ptr<const Predicate> predicate,
+                                                QueryListener listener) override;
+    ChangeTicket attributes_changed(const EntryRef& ref) override;
+    void entry_changed(const EntryRef& ref) override;
+    void follow_changes() override;
+    Status reconcile(DeviceId volume, Depth depth, const std::atomic<bool>* cancelled) override;
+    Status rebuild(DeviceId volume, const std::function<bool(std::uint64_t)>& progress) override;
+    Status flush(DeviceId volume) override;
+    void shut_down() override;
+
+    /// Null when there is no such volume, or it cannot have an index.
+    std::shared_ptr<VolumeIndex> of(DeviceId volume);
+
+  private:
+    Mutex mutex_;
+    std::map<DeviceId, std::shared_ptr<VolumeIndex>> indexes_ GUARDED_BY(mutex_);
+};
+
+} // namespace host
