@@ -3,7 +3,6 @@
 #include "BitmapViews.h"
 #include "PixelSurface.h"
 
-#include <ClassInfo.h>
 #include <Message.h>
 #include <TypeConstants.h>
 #include <View.h>
@@ -67,6 +66,8 @@ bool ConvertRow(const SourceRows& source, int64 sourceX, int64 sourceY, const Pi
 }
 
 } // namespace
+
+REGISTER_ARCHIVABLE(BBitmap);
 
 BBitmap::BBitmap(BRect bounds, uint32 flags, color_space space, int32 bytesPerRow, screen_id /*screen*/) {
     Init(bounds, space, flags, bytesPerRow);

@@ -1,6 +1,5 @@
 #include <ListItem.h>
 
-#include <ClassInfo.h>
 #include <Font.h>
 #include <InterfaceDefs.h>
 #include <Message.h>
@@ -21,6 +20,8 @@ constexpr rgb_color kSelectedBackground = {178, 178, 178, 255};
 constexpr rgb_color kDisabledText = {128, 128, 128, 255};
 
 } // namespace
+
+REGISTER_ARCHIVABLE(BStringItem);
 
 BListItem::BListItem(uint32 outlineLevel, bool expanded) : mOutlineLevel(outlineLevel), mExpanded(expanded) {}
 

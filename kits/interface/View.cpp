@@ -4,7 +4,6 @@
 #include "LineArray.h"
 #include "ViewHost.h"
 
-#include <ClassInfo.h>
 #include <Message.h>
 
 #include <algorithm>
@@ -29,6 +28,8 @@ rgb_color IntToColor(int32 value) {
 }
 
 } // namespace
+
+REGISTER_ARCHIVABLE(BView);
 
 BView::BView(BRect frame, const char* name, uint32 resizingMode, uint32 flags)
     : BHandler(name), mState(std::make_unique<DrawingState>()) {

@@ -1,1 +1,0 @@
-// Replaced by this kit's first source.
