@@ -1,6 +1,7 @@
 #include "Interruption.h"
 
 #include <csignal>
+#include <initializer_list>
 
 namespace {
 
