@@ -6,7 +6,8 @@
 class BPath;
 class BVolume;
 
-enum directory_which {
+// Any int may be asked for, so that a wrong number is an answer and not an accident.
+enum directory_which : int {
     B_DESKTOP_DIRECTORY = 0,
     B_TRASH_DIRECTORY,
 
