@@ -116,7 +116,15 @@ const struct stat* TreeWalker::entered_directory() const {
 }
 
 void TreeWalker::remember_directory() {
-    for (std::size_t i = std::min(current_ + 1, frames_.size()); i-- > 1;) {
+    remember_frames(std::min(current_ + 1, frames_.size()));
+}
+
+void TreeWalker::remember_entered_directory() {
+    remember_frames(frames_.size());
+}
+
+void TreeWalker::remember_frames(std::size_t count) {
+    for (std::size_t i = count; i-- > 1;) {
         Frame& frame = *frames_[i];
         if (frame.remembered)
             return;

@@ -41,6 +41,8 @@ class TreeWalker {
 
     /// Tells the directory cache the way to the directory that holds the last entry.
     void remember_directory();
+    /// The same for the directory handed out last.
+    void remember_entered_directory();
 
   private:
     struct Frame {
@@ -56,6 +58,7 @@ class TreeWalker {
     TreeWalker(std::shared_ptr<const VolumeSnapshot> volumes, const Volume& volume);
     enum class Descent { entered, unreadable, border };
     Descent descend(const Entry& entry);
+    void remember_frames(std::size_t count);
     bool is_open_above(std::uint64_t inode) const;
 
     const std::shared_ptr<const VolumeSnapshot> volumes_;

@@ -2,6 +2,11 @@
 #include <algorithm>
 
 namespace host {
+namespace {
+
+constexpr std::chrono::milliseconds kLookTime{5};
+
+} // namespace
 
 ChangeTicket ChangeQueue::put(std::uint64_t directory, const std::string& leaf, ChangeNote::Source source) {
     MutexLock lock(mutex_);
@@ -22,9 +27,11 @@ ChangeTicket ChangeQueue::put(std::uint64_t directory, const std::string& leaf, 
                          notes_.back().leaf == leaf && notes_.back().source == source;
     if (!repeats) {
         notes_.push_back({directory, leaf, source});
-        counters_.reported.fetch_add(1, std::memory_order_seq_cst);
+        reported_.fetch_add(1, std::memory_order_seq_cst);
+        if (slot_ != nullptr)
+            slot_->reported.store(reported_.load(), std::memory_order_seq_cst);
     }
-    const std::uint64_t position = counters_.reported.load(std::memory_order_seq_cst);
+    const std::uint64_t position = reported_.load(std::memory_order_seq_cst);
     // The writer looks by itself every few milliseconds once it has begun a group.
     if (writer_waits_ || notes_.size() == kGroup)
         filled_.notify_one();
@@ -44,8 +51,11 @@ bool ChangeQueue::take(std::vector<ChangeNote>& group, std::uint64_t& position) 
         return false;
     const auto deadline = std::chrono::steady_clock::now() + kGroupTime;
     while (notes_.size() < kGroup && !hurried_ && !stopped_) {
-        if (filled_.wait_until(lock, deadline) == std::cv_status::timeout)
+        const auto time = std::chrono::steady_clock::now();
+        if (time >= deadline || (slot_ != nullptr && slot_->hurry.exchange(0) != 0))
             break;
+        // Other processes can only leave a flag.
+        filled_.wait_until(lock, std::min(deadline, time + kLookTime));
     }
     if (notes_.size() <= kGroup) {
         group.swap(notes_);
@@ -55,7 +65,7 @@ bool ChangeQueue::take(std::vector<ChangeNote>& group, std::uint64_t& position) 
         group.assign(std::make_move_iterator(notes_.begin()), std::make_move_iterator(end));
         notes_.erase(notes_.begin(), end);
     }
-    position = counters_.reported.load(std::memory_order_seq_cst) - notes_.size();
+    position = reported_.load(std::memory_order_seq_cst) - notes_.size();
     taken_.store(position, std::memory_order_seq_cst);
     drained_.notify_all();
     return true;
@@ -63,8 +73,21 @@ bool ChangeQueue::take(std::vector<ChangeNote>& group, std::uint64_t& position) 
 
 void ChangeQueue::set_committed(std::uint64_t position) {
     MutexLock lock(mutex_);
-    counters_.committed.store(position, std::memory_order_seq_cst);
-    committed_.notify_all();
+    committed_.store(position, std::memory_order_seq_cst);
+    if (slot_ != nullptr) {
+        slot_->committed.store(position, std::memory_order_seq_cst);
+        SharedSlots::wake(*slot_);
+    }
+    moved_.notify_all();
+}
+
+void ChangeQueue::show_in(ProcessSlot* slot) {
+    MutexLock lock(mutex_);
+    slot_ = slot;
+    if (slot_ != nullptr) {
+        slot_->committed.store(committed_.load());
+        slot_->reported.store(reported_.load());
+    }
 }
 
 void ChangeQueue::wait_for(std::uint64_t position) {
@@ -74,7 +97,7 @@ void ChangeQueue::wait_for(std::uint64_t position) {
     while (committed() < position && !stopped_) {
         hurried_ = true;
         filled_.notify_one();
-        committed_.wait(lock);
+        moved_.wait(lock);
     }
 }
 
@@ -89,7 +112,7 @@ void ChangeQueue::stop() {
     stopped_ = true;
     filled_.notify_all();
     drained_.notify_all();
-    committed_.notify_all();
+    moved_.notify_all();
 }
 
 } // namespace host

@@ -3,6 +3,7 @@
 #include "host/api/entry.h"
 #include "host/api/index.h"
 #include "host/api/thread_safety.h"
+#include "host/sqlite/shared_slots.h"
 #include <atomic>
 #include <chrono>
 #include <condition_variable>
@@ -25,13 +26,6 @@ struct ChangeNote {
     Source source = Source::own;
 };
 
-/// Counters of one process's queue, readable by other processes where they lie in shared memory. All count
-/// notes since the process opened the index.
-struct QueueCounters {
-    std::atomic<std::uint64_t> reported{0};
-    std::atomic<std::uint64_t> committed{0};
-};
-
 /// The notes of one volume that wait for its writer. Bounded: see put(). Any thread.
 class ChangeQueue {
   public:
@@ -39,7 +33,8 @@ class ChangeQueue {
     static constexpr std::size_t kGroup = 4096;
     static constexpr std::chrono::milliseconds kGroupTime{50};
 
-    explicit ChangeQueue(QueueCounters& counters) : counters_(counters) {}
+    /// From now on other processes see how far this queue is. Null: no more. The slot must live until then.
+    void show_in(ProcessSlot* slot);
 
     /// Appends a note. When the queue is full the caller waits up to a second for room; then the note is
     /// dropped, and overflowed() tells so.
@@ -51,8 +46,8 @@ class ChangeQueue {
     /// All notes up to this position are in the database (or given up).
     void set_committed(std::uint64_t position);
 
-    std::uint64_t reported() const { return counters_.reported.load(std::memory_order_seq_cst); }
-    std::uint64_t committed() const { return counters_.committed.load(std::memory_order_seq_cst); }
+    std::uint64_t reported() const { return reported_.load(std::memory_order_seq_cst); }
+    std::uint64_t committed() const { return committed_.load(std::memory_order_seq_cst); }
     /// Wakes the writer at once and waits until it has committed up to this position, or stop().
     void wait_for(std::uint64_t position);
     /// Wakes the writer without waiting.
@@ -63,17 +58,19 @@ class ChangeQueue {
     bool overflowed() { return overflowed_.exchange(false); }
 
   private:
-    QueueCounters& counters_;
+    std::atomic<std::uint64_t> reported_{0};
+    std::atomic<std::uint64_t> committed_{0};
     std::atomic<std::uint64_t> taken_{0};
     std::atomic<bool> overflowed_{false};
     Mutex mutex_;
     std::condition_variable_any filled_;
     std::condition_variable_any drained_;
-    std::condition_variable_any committed_;
+    std::condition_variable_any moved_;
     std::vector<ChangeNote> notes_ GUARDED_BY(mutex_);
     bool hurried_ GUARDED_BY(mutex_) = false;
     bool stopped_ GUARDED_BY(mutex_) = false;
     bool writer_waits_ GUARDED_BY(mutex_) = false;
+    ProcessSlot* slot_ GUARDED_BY(mutex_) = nullptr;
 };
 
 } // namespace host

@@ -22,6 +22,13 @@ VolumeIndex::VolumeIndex(DeviceId device, const std::string& stable_key)
 VolumeIndex::~VolumeIndex() {
     stopping_ = true;
     queue_.stop();
+    std::unique_ptr<ChangeWatcher> watcher;
+    {
+        MutexLock lock(background_mutex_);
+        watcher = std::move(watcher_);
+    }
+    // Its thread may be about to start a walk, which takes the mutex.
+    watcher.reset();
     {
         MutexLock lock(background_mutex_);
         if (background_.joinable())
@@ -39,9 +46,11 @@ VolumeIndex::~VolumeIndex() {
         readers_.clear();
     }
     MutexLock lock(mutex_);
-    if (store_.is_open() && dirty_ && !lost_changes_)
+    if (store_.is_open() && dirty_ && !lost_changes_ && !found_unclean_ && !slots_.others_alive())
         (void)store_.set_meta("clean", 1);
     store_.close();
+    queue_.show_in(nullptr);
+    slots_.close();
 }
 
 bool VolumeIndex::open_store_locked() {
@@ -69,7 +78,7 @@ bool VolumeIndex::open_store_locked() {
     indexed_.clear();
     for (const ListedIndex& index : list_)
         indexed_.insert(index.attribute);
-    found_unclean_ = store_.meta("clean", 0) == 0;
+    found_unclean_ = store_.meta("clean", 0) == 0 && !dirty_;
     return true;
 }
 
@@ -80,6 +89,12 @@ bool VolumeIndex::open_locked(Opening opening) {
         return false;
     if (!files_.make_directory().ok() || !open_store_locked())
         return false;
+    if (slots_.open(files_.slots()))
+        queue_.show_in(slots_.own());
+    if (slots_.take_over_dead() || (found_unclean_ && !slots_.others_alive())) {
+        found_unclean_ = true;
+        reconcile_in_background();
+    }
     if (!writer_thread_.joinable() && !stopping_)
         writer_thread_ = std::thread([this] { write_groups(); });
     open_ = true;
@@ -267,6 +282,9 @@ Status VolumeIndex::search(const Condition& condition, std::vector<RowNumber>& r
     if (!in_use())
         return {};
     (void)flush();
+    slots_.wait_for_others();
+    if (slots_.take_over_dead())
+        reconcile_in_background();
     for (int attempt = 0; attempt < 3; ++attempt) {
         {
             MutexLock lock(mutex_);
@@ -340,20 +358,27 @@ void VolumeIndex::run_background() {
         (void)set_thread_name(current_native_thread(), "index walker");
         (void)set_thread_schedule(current_native_thread(), {process_niceness() + 10, io_class::idle});
         Status status = EAGAIN;
-        while (!stopping_ && status.error() == EAGAIN && !is_complete())
+        while (!stopping_ &&
+               (reconcile_wanted_.exchange(false) || (status.error() == EAGAIN && !is_complete())))
             status = walk_volume(Looking::changed_only, &stopping_, nullptr);
         background_runs_ = false;
     });
 }
 
-void VolumeIndex::reconcile_after_crash() {
-    {
-        MutexLock lock(mutex_);
-        if (!open_locked(Opening::only_existing) || !found_unclean_)
-            return;
-        found_unclean_ = false;
-        (void)store_.set_meta("complete", 0);
-    }
+void VolumeIndex::follow() {
+    MutexLock lock(background_mutex_);
+    if (watcher_ || stopping_)
+        return;
+    ChangeWatcher::Sink sink;
+    sink.entry_changed = [this](std::uint64_t directory, const std::string& leaf) {
+        entry_observed(directory, leaf, ChangeNote::Source::observed);
+    };
+    sink.changes_missed = [this] { reconcile_in_background(); };
+    watcher_ = std::make_unique<ChangeWatcher>(device_, std::move(sink));
+}
+
+void VolumeIndex::reconcile_in_background() {
+    reconcile_wanted_ = true;
     run_background();
 }
 

@@ -2,11 +2,13 @@
 
 #include "host/api/index.h"
 #include "host/api/thread_safety.h"
+#include "host/linux/change_watcher.h"
 #include "host/sqlite/change_queue.h"
 #include "host/sqlite/index_files.h"
 #include "host/sqlite/live_queries.h"
 #include "host/sqlite/row_writer.h"
 #include "host/sqlite/search_columns.h"
+#include "host/sqlite/shared_slots.h"
 #include <atomic>
 #include <memory>
 #include <set>
@@ -51,8 +53,10 @@ class VolumeIndex {
     Status flush();
     Status reconcile(Indexes::Depth depth, const std::atomic<bool>* cancelled);
     Status rebuild(const std::function<bool(std::uint64_t)>& progress);
-    /// Reconciles in the background when the last user of the database has not closed it cleanly.
-    void reconcile_after_crash();
+    /// Follows other programs' changes from now on; later calls do nothing.
+    void follow();
+    /// Walks the whole volume in the background, at idle priority.
+    void reconcile_in_background();
 
     /// There are indices on this volume (made by any process).
     bool in_use();
@@ -81,8 +85,9 @@ class VolumeIndex {
     const DeviceId device_;
     const std::string stable_key_;
     const IndexFiles files_;
-    QueueCounters counters_;
-    ChangeQueue queue_{counters_};
+    SharedSlots slots_;
+    ChangeQueue queue_;
+    std::atomic<bool> reconcile_wanted_{false};
     SearchColumns columns_{files_.database()};
     LiveQueries live_;
 
@@ -109,6 +114,7 @@ class VolumeIndex {
     Mutex background_mutex_;
     std::thread background_ GUARDED_BY(background_mutex_);
     std::atomic<bool> background_runs_{false};
+    std::unique_ptr<ChangeWatcher> watcher_ GUARDED_BY(background_mutex_);
     std::atomic<bool> stopping_{false};
 };
 

@@ -34,7 +34,12 @@ Status VolumeIndexes::create(DeviceId device, const std::string& attribute, std:
     if (info->read_only)
         return EROFS;
     const auto index = of(device);
-    return index ? index->create(attribute, type) : Status(ENOTSUP);
+    if (!index)
+        return ENOTSUP;
+    const Status created = index->create(attribute, type);
+    if (created.ok() && following_)
+        index->follow();
+    return created;
 }
 
 Status VolumeIndexes::remove(DeviceId device, const std::string& attribute) {
@@ -115,9 +120,10 @@ void VolumeIndexes::entry_changed(const EntryRef& ref) {
 }
 
 void VolumeIndexes::follow_changes() {
+    following_ = true;
     for (const DeviceId device : VolumeTable::instance().list()) {
-        if (const auto index = of(device))
-            index->reconcile_after_crash();
+        if (const auto index = of(device); index && index->in_use())
+            index->follow();
     }
 }
 

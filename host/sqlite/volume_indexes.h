@@ -32,6 +32,7 @@ class VolumeIndexes final : public Indexes {
     std::shared_ptr<VolumeIndex> of(DeviceId volume);
 
   private:
+    std::atomic<bool> following_{false};
     Mutex mutex_;
     std::map<DeviceId, std::shared_ptr<VolumeIndex>> indexes_ GUARDED_BY(mutex_);
 };

@@ -133,6 +133,7 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
         lost_changes_ = true;
         return ENOTSUP;
     }
+    found_unclean_ = false;
     if (progress)
         (void)progress(count);
     return {};

@@ -284,6 +284,25 @@ TEST_F(QueryTest, WalkToleratesTaggingWhileWalking) {
     EXPECT_EQ(find(contains("A", "v")).size(), 500U);
 }
 
+TEST_F(QueryTest, ChangesByOthersAreFollowed) {
+    ASSERT_TRUE(indexes().create(device_, "A", kText).ok());
+    make("one");
+    indexes().follow_changes();
+    const auto eventually = [&](const Leaves& expected) {
+        for (int i = 0; i < 500 && find(contains("A", "x")) != expected; ++i)
+            usleep(10000);
+        return find(contains("A", "x"));
+    };
+    tag_outside("one", "A", "x");
+    EXPECT_EQ(eventually(Leaves{"one"}), Leaves{"one"});
+    std::filesystem::create_directories(root_ + "/new/deep");
+    std::ofstream(root_ + "/new/deep/two") << "t";
+    tag_outside("new/deep/two", "A", "xx");
+    EXPECT_EQ(eventually(Leaves{"one", "two"}), (Leaves{"one", "two"}));
+    std::filesystem::rename(root_ + "/one", root_ + "/new/three");
+    EXPECT_EQ(eventually(Leaves{"three", "two"}), (Leaves{"three", "two"}));
+}
+
 TEST_F(QueryTest, UnknownVolumeAnswersNoDevice) {
     EXPECT_EQ(indexes().query(12345, contains("A", "x"), nullptr).error(), ENODEV);
     EXPECT_EQ(indexes().create(12345, "A", kText).error(), ENODEV);
