@@ -19,8 +19,8 @@ BLooper::BLooper(BMessage* from) : BHandler(from) {
 }
 
 void BLooper::InitialiseLooper(int32 portCapacity) {
-    mState =
-        std::make_shared<LooperState>(this, portCapacity > 0 ? portCapacity : B_LOOPER_PORT_DEFAULT_CAPACITY);
+    mState = std::make_shared<LooperState>(this, mToken,
+                                           portCapacity > 0 ? portCapacity : B_LOOPER_PORT_DEFAULT_CAPACITY);
     mState->lock.Lock(B_INFINITE_TIMEOUT);
     LooperTable::Instance().Add(mState);
     AddHandler(this);
@@ -51,32 +51,37 @@ status_t BLooper::Archive(BMessage* into, bool deep) const {
 }
 
 status_t BLooper::PostMessage(uint32 command) {
-    BMessage message(command);
-    return PostMessage(&message, nullptr);
+    const BMessage message(command);
+    return PostTo(this, message);
 }
 
 status_t BLooper::PostMessage(BMessage* message) {
-    // The looper itself, not its preferred handler, gets what is posted without a handler.
-    const std::shared_ptr<LooperState> state = LooperTable::Instance().Find(this);
-    if (state == nullptr)
-        return B_BAD_PORT_ID;
-    return message != nullptr ? MessageDelivery::Post(*message, *state, mToken, {}) : B_BAD_VALUE;
+    return message != nullptr ? PostTo(this, *message) : B_BAD_VALUE;
 }
 
 status_t BLooper::PostMessage(uint32 command, BHandler* handler, BHandler* replyTo) {
-    BMessage message(command);
-    return PostMessage(&message, handler, replyTo);
+    const BMessage message(command);
+    return PostTo(this, message, handler, replyTo);
 }
 
 status_t BLooper::PostMessage(BMessage* message, BHandler* handler, BHandler* replyTo) {
-    const std::shared_ptr<LooperState> state = LooperTable::Instance().Find(this);
+    return message != nullptr ? PostTo(this, *message, handler, replyTo) : B_BAD_VALUE;
+}
+
+// Static, since the looper may go away at any time: it is only an address here.
+status_t BLooper::PostTo(const BLooper* looper, const BMessage& message) {
+    const std::shared_ptr<LooperState> state = LooperTable::Instance().Find(looper);
+    return state != nullptr ? MessageDelivery::Post(message, *state, state->token, {}) : B_BAD_PORT_ID;
+}
+
+status_t BLooper::PostTo(const BLooper* looper, const BMessage& message, BHandler* handler,
+                         BHandler* replyTo) {
+    const std::shared_ptr<LooperState> state = LooperTable::Instance().Find(looper);
     if (state == nullptr)
         return B_BAD_PORT_ID;
-    if (message == nullptr)
-        return B_BAD_VALUE;
-    if (handler != nullptr && handler->Looper() != this)
+    if (handler != nullptr && handler->Looper() != looper)
         return B_MISMATCHED_VALUES;
-    return MessageDelivery::Post(*message, *state, handler != nullptr ? handler->mToken : 0,
+    return MessageDelivery::Post(message, *state, handler != nullptr ? handler->mToken : 0,
                                  MessageDelivery::AddressOf(BMessenger(replyTo)));
 }
 
@@ -317,11 +322,13 @@ bool BLooper::QuitRequested() {
     return true;
 }
 
+// These are asked about loopers that may be gone, so they go by the address and never look at the object, nor
+// call each other on it.
 bool BLooper::Lock() {
-    return LockWithTimeout(B_INFINITE_TIMEOUT) == B_OK;
+    const std::shared_ptr<LooperState> state = LooperTable::Instance().Find(this);
+    return state != nullptr && state->lock.Lock(B_INFINITE_TIMEOUT) == B_OK;
 }
 
-// These are asked about loopers that may be gone, so they go by the address and never look at the object.
 status_t BLooper::LockWithTimeout(bigtime_t timeout) {
     const std::shared_ptr<LooperState> state = LooperTable::Instance().Find(this);
     return state != nullptr ? state->lock.Lock(timeout) : B_BAD_VALUE;

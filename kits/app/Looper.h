@@ -103,6 +103,9 @@ class BLooper : public BHandler {
     friend class BMessenger;
     void InitialiseLooper(int32 portCapacity);
     static int32 ThreadEntry(void* looper);
+    static status_t PostTo(const BLooper* looper, const BMessage& message);
+    static status_t PostTo(const BLooper* looper, const BMessage& message, BHandler* handler,
+                           BHandler* replyTo);
     BHandler* TargetOf(const BMessage& message);
     BHandler* ResolveTarget(BMessage* message, BHandler* target);
     BHandler* Filtered(BMessage* message, BHandler* target);

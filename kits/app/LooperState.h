@@ -14,7 +14,8 @@ class BLooper;
 class LooperState {
   public:
     // `capacity` is the number of queued messages from which on a delivery with a time-out waits.
-    LooperState(BLooper* owner, int32 capacity) : looper(owner), mCapacity(capacity) {}
+    LooperState(BLooper* owner, int32 ownerToken, int32 capacity)
+        : looper(owner), token(ownerToken), mCapacity(capacity) {}
 
     // Queues the message however many wait already: what is posted is never lost. B_BAD_PORT_ID once the
     // looper is going away.
@@ -26,9 +27,12 @@ class LooperState {
     std::unique_ptr<BMessage> WaitForMessage();
     // Refuses messages from now on, wakes everyone who waits and deletes the messages that are left.
     void Close();
+    bool IsOpen() const { return !mClosed; }
 
     // Valid while the lock is held and IsOpen().
     BLooper* const looper;
+    // The looper's own, as a handler.
+    const int32 token;
     LooperLock lock;
     BMessageQueue queue;
     // 0 until the looper runs.

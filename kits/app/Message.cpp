@@ -82,8 +82,11 @@ bool BMessage::IsEmpty() const {
 }
 
 bool BMessage::IsSystem() const {
-    const char first = static_cast<char>(what >> 24);
-    return first == '_';
+    const auto isCapital = [this](int shift) {
+        const uint32 letter = (what >> shift) & 0xff;
+        return letter >= 'A' && letter <= 'Z';
+    };
+    return what >> 24 == '_' && isCapital(16) && isCapital(8) && isCapital(0);
 }
 
 bool BMessage::IsReply() const {

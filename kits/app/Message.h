@@ -63,6 +63,7 @@ class BMessage {
     status_t GetInfo(const char* name, type_code* typeFound, bool* fixedSize) const;
     int32 CountNames(type_code type) const;
     bool IsEmpty() const;
+    // The code is an underscore and three capital letters.
     bool IsSystem() const;
     bool IsReply() const;
     void PrintToStream() const;

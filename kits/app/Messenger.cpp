@@ -38,7 +38,10 @@ status_t BMessenger::SetTo(const BHandler* handler, const BLooper* looper) {
     if (handler == nullptr && looper == nullptr)
         return B_BAD_VALUE;
     if (handler == nullptr) {
-        mAddress = MessageDelivery::LocalAddress(looper->mToken, true);
+        const std::shared_ptr<LooperState> state = LooperTable::Instance().Find(looper);
+        if (state == nullptr)
+            return B_BAD_VALUE;
+        mAddress = MessageDelivery::LocalAddress(state->token, true);
         return B_OK;
     }
     const BLooper* owner = handler->Looper();
@@ -112,7 +115,8 @@ bool BMessenger::IsValid() const {
     if (!IsTargetLocal())
         return false;
     const TokenTable& table = TokenTable::Instance();
-    return table.Find(mAddress.token).looper != nullptr || table.FindReplyBox(mAddress.token) != nullptr;
+    const std::shared_ptr<LooperState> looper = table.Find(mAddress.token).looper;
+    return looper != nullptr ? looper->IsOpen() : table.FindReplyBox(mAddress.token) != nullptr;
 }
 
 team_id BMessenger::Team() const {
