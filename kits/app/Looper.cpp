@@ -31,8 +31,9 @@ BLooper::~BLooper() {
         std::fprintf(stderr, "BLooper %s: a looper that runs is ended by Quit(), not deleted\n",
                      Name() != nullptr ? Name() : "");
     mState->lock.Lock(B_INFINITE_TIMEOUT);
-    LooperTable::Instance().Remove(this);
+    // Closed first: who is refused a post must not find a messenger still valid.
     mState->Close();
+    LooperTable::Instance().Remove(this);
     mCurrentMessage.reset();
     SetCommonFilterList(nullptr);
     while (mHandlers.CountItems() > 0)
