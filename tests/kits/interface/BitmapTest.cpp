@@ -218,7 +218,8 @@ TEST_F(BitmapArchive, OfAnUnknownSpaceIsDamaged) {
 TEST_F(BitmapArchive, WithMoreOrLessDataThanItsFrameIsDamaged) {
     const std::vector<uint8> data(25, 1);
     for (const ssize_t size : {1, 23, 25}) {
-        mArchive.ReplaceData("_data", B_RAW_TYPE, data.data(), size);
+        ASSERT_EQ(mArchive.RemoveName("_data"), B_OK);
+        ASSERT_EQ(mArchive.AddData("_data", B_RAW_TYPE, data.data(), size), B_OK);
         ExpectInvalid();
     }
 }
