@@ -1,0 +1,203 @@
+#include "indexing/FileIndexListItem.h"
+
+#include "metadata/BrindleMetaData.h"
+#include "metadata/MusicAttributes.h"
+
+#include <Bitmap.h>
+#include <Directory.h>
+#include <Entry.h>
+#include <Node.h>
+#include <NodeInfo.h>
+#include <View.h>
+
+#include <cstdio>
+
+namespace {
+
+constexpr int kStatusPasses = 300;
+constexpr bigtime_t kStatusPassTime = 10000;
+// The buffer that the predicate is read back into; nothing comes of it.
+constexpr size_t kPredicateBufferSize = 255;
+
+// The last two are removed a second time, which is harmless and intended.
+constexpr const char* kRemovedAttributes[] = {
+    kAttributeSongname, kAttributeArtist,   kAttributeAlbum,      kAttributeTrackNo,    kAttributeDisc,
+    kAttributeVersion,  kAttributeLength,   kAttributeLengthUsec, kAttributeSamplerate, kAttributeFramerate,
+    kAttributeBitrate,  kAttributeChannels, kAttributeEncoder,    kAttributeCoverImage, kAttributeCoverColor,
+    kAttributeLength,   kAttributeBitrate,
+};
+
+std::unique_ptr<BBitmap> IconOfRootDirectory(const BVolume& volume) {
+    auto icon = std::make_unique<BBitmap>(BRect(0, 0, 15, 15), B_CMAP8);
+    BDirectory root;
+    BEntry entry;
+    volume.GetRootDirectory(&root);
+    root.GetEntry(&entry);
+    BNode node(&entry);
+    BNodeInfo nodeInfo(&node);
+    if (nodeInfo.GetTrackerIcon(icon.get(), B_MINI_ICON) != B_OK) {
+        printf("can't get icon for volume\n");
+        icon.reset();
+    }
+    return icon;
+}
+
+} // namespace
+
+FileIndexListItem::FileIndexListItem(VolumeListEntry* entry)
+    : BListItem(0, true), mSupported(entry->volume->KnowsAttr() && entry->volume->KnowsQuery()),
+      mEntry(entry), mIcon(IconOfRootDirectory(*entry->volume)) {}
+
+FileIndexListItem::~FileIndexListItem() {
+    StopThread();
+}
+
+void FileIndexListItem::StatAttributes() {
+    StartJob(thread_func_stat, "attr_stat", kJobStatus);
+}
+
+void FileIndexListItem::EraseAttributes() {
+    StartJob(thread_func_erase, "attr_erase", kJobErase);
+}
+
+void FileIndexListItem::IndexAttributes() {
+    StartJob(thread_func_index, "attr_index", kJobIndex);
+}
+
+void FileIndexListItem::StartJob(thread_func function, const char* threadName, JobState state) {
+    const thread_id thread = spawn_thread(function, threadName, B_LOW_PRIORITY, this);
+    if (thread < B_OK)
+        return;
+    // The job asks for messages under this id, and it may be over before resume_thread() returns: both its id
+    // and its flags are set before it runs.
+    mThread.store(thread, std::memory_order_relaxed);
+    mRunning.store(true, std::memory_order_relaxed);
+    mDone.store(false, std::memory_order_relaxed);
+    mJobState.store(state, std::memory_order_relaxed);
+    resume_thread(thread);
+}
+
+int32 FileIndexListItem::thread_func_stat(void* item) {
+    static_cast<FileIndexListItem*>(item)->StatAttributesThread();
+    return B_OK;
+}
+
+int32 FileIndexListItem::thread_func_erase(void* item) {
+    static_cast<FileIndexListItem*>(item)->EraseAttributesThread();
+    return B_OK;
+}
+
+int32 FileIndexListItem::thread_func_index(void* item) {
+    static_cast<FileIndexListItem*>(item)->IndexAttributesThread();
+    return B_OK;
+}
+
+void FileIndexListItem::StatAttributesThread() {
+    for (int pass = 1; pass <= kStatusPasses && !IsCancelled(); ++pass) {
+        snooze(kStatusPassTime);
+        mProgress.store(static_cast<float>(pass / double{kStatusPasses}), std::memory_order_relaxed);
+    }
+    EndJob();
+}
+
+void FileIndexListItem::EraseAttributesThread() {
+    BQuery query;
+    if (FetchMP3Files(query)) {
+        BEntry entry;
+        BNode node;
+        while (!IsCancelled()) {
+            if (query.GetNextEntry(&entry, false) != B_OK) {
+                mProgress.store(kProgressFinished, std::memory_order_relaxed);
+                break;
+            }
+            CountFile();
+            node.SetTo(&entry);
+            RemoveAttributes(&node);
+            mProgress.store(kProgressUnknown, std::memory_order_relaxed);
+        }
+    }
+    EndJob();
+}
+
+void FileIndexListItem::IndexAttributesThread() {
+    BQuery query;
+    if (FetchMP3Files(query)) {
+        entry_ref ref;
+        BrindleMetaData metaData;
+        while (!IsCancelled()) {
+            if (query.GetNextRef(&ref) != B_OK) {
+                mProgress.store(kProgressFinished, std::memory_order_relaxed);
+                break;
+            }
+            CountFile();
+            metaData.ReadMetaDataFromRef(&ref);
+            mProgress.store(kProgressUnknown, std::memory_order_relaxed);
+        }
+    }
+    EndJob();
+}
+
+bool FileIndexListItem::FetchMP3Files(BQuery& query) {
+    query.PushAttr("name");
+    query.PushString(".mp3");
+    query.PushOp(B_ENDS_WITH);
+    query.PushAttr("name");
+    query.PushString(".MP3");
+    query.PushOp(B_ENDS_WITH);
+    query.PushOp(B_OR);
+    query.SetVolume(mEntry->volume.get());
+    char predicate[kPredicateBufferSize];
+    query.GetPredicate(predicate, sizeof(predicate));
+
+    mProgress.store(kProgressStarted, std::memory_order_relaxed);
+    const status_t status = query.Fetch();
+    if (status != B_OK) {
+        printf("Error %s while on Fetch()\n", strerror(status));
+        return false;
+    }
+    mFileCount.store(0, std::memory_order_relaxed);
+    return true;
+}
+
+void FileIndexListItem::CountFile() {
+    mFileCount.store(FileCount() + 1, std::memory_order_relaxed);
+}
+
+// The job's last step that touches the row.
+void FileIndexListItem::EndJob() {
+    mRunning.store(false, std::memory_order_release);
+    mDone.store(true, std::memory_order_release);
+}
+
+void FileIndexListItem::CancelScan() {
+    StopThread();
+    mRunning.store(false, std::memory_order_relaxed);
+    mJobState.store(kJobCancelled, std::memory_order_relaxed);
+}
+
+void FileIndexListItem::StopThread() {
+    const thread_id thread = Thread();
+    if (thread == 0)
+        return;
+    // A message in the thread's queue, whatever it says, stops the job. For a thread that has ended, both
+    // calls return at once.
+    send_data(thread, MSG_INDEX_STOP, nullptr, 0);
+    status_t exitStatus = B_OK;
+    wait_for_thread(thread, &exitStatus);
+    mThread.store(0, std::memory_order_relaxed);
+}
+
+void FileIndexListItem::RemoveAttributes(BNode* node) {
+    for (const char* name : kRemovedAttributes)
+        node->RemoveAttr(name);
+}
+
+void FileIndexListItem::GetStatusText(char (&text)[kJobStatusTextSize]) const {
+    FormatJobStatus(State(), Progress(), FileCount(), text);
+}
+
+void FileIndexListItem::DrawItem(BView* owner, BRect frame, bool) {
+    char text[kJobStatusTextSize];
+    GetStatusText(text);
+    owner->DrawString(text, BPoint(frame.left, frame.bottom));
+}
