@@ -42,7 +42,7 @@ void TextColumn::settle() {
     value_of_block_.shrink_to_fit();
 }
 
-std::size_t TextColumn::value_end(ValueNumber value) const {
+inline std::size_t TextColumn::value_end(ValueNumber value) const {
     return value + std::size_t{1} < starts_.size() ? starts_[value + 1] : arena_.size();
 }
 
@@ -197,14 +197,14 @@ void TextColumn::join(TextColumn&& other) {
     other = TextColumn();
 }
 
-TextColumn::ValueNumber TextColumn::value_at(std::size_t position, ValueNumber not_before) const {
+inline TextColumn::ValueNumber TextColumn::value_at(std::size_t position, ValueNumber not_before) const {
     ValueNumber value = std::max(not_before, value_of_block_[position / kBlock]);
     while (value + std::size_t{1} < starts_.size() && starts_[value + 1] <= position)
         ++value;
     return value;
 }
 
-void TextColumn::insert_rows(ValueNumber value, RowSet& rows) const {
+inline void TextColumn::insert_rows(ValueNumber value, RowSet& rows) const {
     const std::uint32_t holder = rows_of_value_[value];
     if (holder == kNoRow)
         return;
