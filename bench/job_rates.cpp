@@ -132,12 +132,12 @@ bool Apart(const std::function<bool()>& work) {
 int main(int argc, char** argv) {
     const std::size_t count = argc > 1 ? std::strtoull(argv[1], nullptr, 10) : 100'000;
     const int rounds = argc > 2 ? std::atoi(argv[2]) : 5;
-    std::string pattern = (argc > 3 ? fs::path(argv[3]) : fs::temp_directory_path()) / "quirnel-bench.XXXXXX";
-    if (mkdtemp(pattern.data()) == nullptr) {
+    std::string place = (argc > 3 ? fs::path(argv[3]) : fs::temp_directory_path()) / "quirnel-bench.XXXXXX";
+    if (mkdtemp(place.data()) == nullptr) {
         std::perror("mkdtemp");
         return 1;
     }
-    const fs::path folder = pattern;
+    const fs::path folder = place;
     for (const char* variable : {"XDG_CONFIG_HOME", "XDG_DATA_HOME", "XDG_CACHE_HOME", "XDG_RUNTIME_DIR"})
         setenv(variable, (folder / variable).c_str(), 1);
     fs::create_directory(folder / "XDG_RUNTIME_DIR");

@@ -27,7 +27,7 @@ enum : uint32 {
     B_PULSE = '_PUL',
     B_QUIT_REQUESTED = '_QRQ',
     B_READY_TO_RUN = '_RTR',
-    B_REFS_RECEIVED = '_RRC',
+    B_REFS_RECEIVED = 'RRC_',
     B_SCREEN_CHANGED = '_SCH',
     B_VALUE_CHANGED = '_VCH',
     B_VIEW_MOVED = '_VMV',

@@ -67,8 +67,7 @@ bool PathOf(directory_which which, std::string& path) {
         break;
     }
     path.clear();
-    return (which >= B_BEOS_DIRECTORY && which <= B_BEOS_SOUNDS_DIRECTORY) ||
-           (which >= B_COMMON_DIRECTORY && which <= B_COMMON_SOUNDS_DIRECTORY) ||
+    return (which >= B_COMMON_DIRECTORY && which <= B_COMMON_SOUNDS_DIRECTORY) ||
            (which >= B_USER_DIRECTORY && which <= B_USER_SOUNDS_DIRECTORY) ||
            (which >= B_APPS_DIRECTORY && which <= B_UTILITIES_DIRECTORY);
 }

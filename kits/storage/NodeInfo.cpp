@@ -15,11 +15,11 @@
 
 namespace {
 
-constexpr const char* kTypeAttribute = "BEOS:TYPE";
-constexpr const char* kPreferredAppAttribute = "BEOS:PREF_APP";
-constexpr const char* kAppHintAttribute = "BEOS:PPATH";
-constexpr const char* kMiniIconAttribute = "BEOS:M:STD_ICON";
-constexpr const char* kLargeIconAttribute = "BEOS:L:STD_ICON";
+constexpr const char* kTypeAttribute = "Node:Type";
+constexpr const char* kPreferredAppAttribute = "Node:PreferredApp";
+constexpr const char* kAppHintAttribute = "Node:AppHint";
+constexpr const char* kMiniIconAttribute = "Node:MiniIcon";
+constexpr const char* kLargeIconAttribute = "Node:LargeIcon";
 
 const char* IconAttribute(icon_size size) {
     return size == B_MINI_ICON ? kMiniIconAttribute : kLargeIconAttribute;

@@ -35,7 +35,6 @@ TEST(MessageTest, ANewMessageIsEmptyAndNotDelivered) {
 
 TEST(MessageTest, CodesOfAnUnderscoreAndCapitalsAreTheSystems) {
     EXPECT_TRUE(BMessage(B_QUIT_REQUESTED).IsSystem());
-    EXPECT_TRUE(BMessage(B_REFS_RECEIVED).IsSystem());
     EXPECT_FALSE(BMessage(B_SIMPLE_DATA).IsSystem());
     EXPECT_FALSE(BMessage('_abc').IsSystem());
     EXPECT_FALSE(BMessage(103).IsSystem());

@@ -66,7 +66,7 @@ TEST_F(NodeInfo, TypeAndApplicationAreAttributes) {
     EXPECT_EQ(info.GetType(text), B_OK);
     EXPECT_STREQ(text, "audio/x-mpeg");
     attr_info attribute;
-    EXPECT_EQ(node.GetAttrInfo("BEOS:TYPE", &attribute), B_OK);
+    EXPECT_EQ(node.GetAttrInfo("Node:Type", &attribute), B_OK);
     EXPECT_EQ(attribute.type, static_cast<uint32>(B_MIME_STRING_TYPE));
     EXPECT_EQ(info.SetType("not a type"), B_BAD_VALUE);
     EXPECT_EQ(info.SetType(nullptr), B_OK);
@@ -89,11 +89,11 @@ TEST_F(NodeInfo, ATypeAttributeThatIsNoTypeIsNotThere) {
     BNodeInfo info(&node);
     char text[B_MIME_TYPE_LENGTH];
     const std::string longText(2000, 'x');
-    ASSERT_GT(node.WriteAttr("BEOS:TYPE", B_MIME_STRING_TYPE, 0, "no type", 8), 0);
+    ASSERT_GT(node.WriteAttr("Node:Type", B_MIME_STRING_TYPE, 0, "no type", 8), 0);
     EXPECT_EQ(info.GetType(text), B_ENTRY_NOT_FOUND);
-    ASSERT_GT(node.WriteAttr("BEOS:TYPE", B_MIME_STRING_TYPE, 0, "", 0) + 1, 0);
+    ASSERT_GT(node.WriteAttr("Node:Type", B_MIME_STRING_TYPE, 0, "", 0) + 1, 0);
     EXPECT_EQ(info.GetType(text), B_ENTRY_NOT_FOUND);
-    ASSERT_GT(node.WriteAttr("BEOS:TYPE", B_MIME_STRING_TYPE, 0, longText.data(), longText.size()), 0);
+    ASSERT_GT(node.WriteAttr("Node:Type", B_MIME_STRING_TYPE, 0, longText.data(), longText.size()), 0);
     (void)info.GetType(text);
     EXPECT_LT(strlen(text), B_MIME_TYPE_LENGTH);
 }
@@ -109,10 +109,10 @@ TEST_F(NodeInfo, IconsAreAttributesOfTheirSize) {
     EXPECT_EQ(info.SetIcon(&mini, B_MINI_ICON), B_OK);
     EXPECT_EQ(info.SetIcon(&large, B_LARGE_ICON), B_OK);
     attr_info attribute;
-    EXPECT_EQ(node.GetAttrInfo("BEOS:M:STD_ICON", &attribute), B_OK);
+    EXPECT_EQ(node.GetAttrInfo("Node:MiniIcon", &attribute), B_OK);
     EXPECT_EQ(attribute.type, static_cast<uint32>(B_MINI_ICON_TYPE));
     EXPECT_EQ(attribute.size, 256);
-    EXPECT_EQ(node.GetAttrInfo("BEOS:L:STD_ICON", &attribute), B_OK);
+    EXPECT_EQ(node.GetAttrInfo("Node:LargeIcon", &attribute), B_OK);
     EXPECT_EQ(attribute.size, 1024);
     BBitmap found(Frame(B_MINI_ICON), B_CMAP8);
     EXPECT_EQ(info.GetIcon(&found, B_MINI_ICON), B_OK);
@@ -142,12 +142,12 @@ TEST_F(NodeInfo, TheFilesOwnIconComesFirst) {
     std::string path = MakeFile("song.mp3");
     BNode node(path.c_str());
     std::string own(256, '\x21');
-    ASSERT_EQ(node.WriteAttr("BEOS:M:STD_ICON", B_MINI_ICON_TYPE, 0, own.data(), own.size()), 256);
+    ASSERT_EQ(node.WriteAttr("Node:MiniIcon", B_MINI_ICON_TYPE, 0, own.data(), own.size()), 256);
     EXPECT_EQ(TrackerIcon(path), own);
     for (size_t wrong : {size_t(0), size_t(255), size_t(257)}) {
         std::string bits(wrong, '\x21');
-        node.RemoveAttr("BEOS:M:STD_ICON");
-        ASSERT_GE(node.WriteAttr("BEOS:M:STD_ICON", B_MINI_ICON_TYPE, 0, bits.data(), bits.size()), 0);
+        node.RemoveAttr("Node:MiniIcon");
+        ASSERT_GE(node.WriteAttr("Node:MiniIcon", B_MINI_ICON_TYPE, 0, bits.data(), bits.size()), 0);
         std::string icon = TrackerIcon(path);
         EXPECT_EQ(icon.size(), 256u);
         EXPECT_NE(icon, own);
