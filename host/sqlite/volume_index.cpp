@@ -8,6 +8,9 @@
 namespace host {
 namespace {
 
+constexpr int kRetrySteps = 100;
+constexpr std::chrono::milliseconds kRetryStep{100};
+
 std::int64_t now() {
     return std::chrono::duration_cast<std::chrono::nanoseconds>(
                std::chrono::system_clock::now().time_since_epoch())
@@ -357,10 +360,14 @@ void VolumeIndex::run_background() {
     background_ = std::thread([this] {
         (void)set_thread_name(current_native_thread(), "index walker");
         (void)set_thread_schedule(current_native_thread(), {process_niceness() + 10, io_class::idle});
-        Status status = EAGAIN;
-        while (!stopping_ &&
-               (reconcile_wanted_.exchange(false) || (status.error() == EAGAIN && !is_complete())))
+        Status status;
+        do {
+            reconcile_wanted_ = false;
             status = walk_volume(Looking::changed_only, &stopping_, nullptr);
+            // The database could not be written: a full disk has time to be seen to.
+            for (int i = 0; status.error() == ENOTSUP && i < kRetrySteps && !stopping_; ++i)
+                std::this_thread::sleep_for(kRetryStep);
+        } while (!stopping_ && (reconcile_wanted_ || status.error() == EAGAIN || status.error() == ENOTSUP));
         background_runs_ = false;
     });
 }

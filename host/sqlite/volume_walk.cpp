@@ -115,7 +115,9 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
     give_back_reader(std::move(reader));
     queue_.wait_for(queue_.reported());
     MutexLock lock(mutex_);
-    if (lost_changes_ || list_.size() != indices || !store_.is_open())
+    if (lost_changes_ || !store_.is_open())
+        return ENOTSUP;
+    if (list_.size() != indices)
         return EAGAIN;
     DatabaseResult result = store_.begin();
     if (succeeded(result))
