@@ -131,6 +131,7 @@ void VolumeIndex::check_file_locked() {
 
 void VolumeIndex::mark_incomplete_locked() {
     lost_changes_ = true;
+    ++losses_;
     (void)store_.set_meta("complete", 0);
 }
 
@@ -253,6 +254,7 @@ bool VolumeIndex::write_group(std::vector<ChangeNote>& group) {
     check_file_locked();
     if (!store_.is_open()) {
         lost_changes_ = true;
+        ++losses_;
         return true;
     }
     if (!dirty_ && succeeded(store_.set_meta("clean", 0)))

@@ -101,6 +101,8 @@ class VolumeIndex {
     bool dirty_ GUARDED_BY(mutex_) = false;
     /// The database on disk lacks something: until a walk of the whole volume has been committed.
     bool lost_changes_ GUARDED_BY(mutex_) = false;
+    /// How often changes were lost: tells a walk that some were while it went on.
+    std::uint64_t losses_ GUARDED_BY(mutex_) = 0;
     bool found_unclean_ GUARDED_BY(mutex_) = false;
     std::thread writer_thread_ GUARDED_BY(mutex_);
     std::atomic<bool> open_{false};

@@ -31,6 +31,7 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
     MutexLock walking(walk_mutex_);
     const std::int64_t started = now();
     std::size_t indices = 0;
+    std::uint64_t losses = 0;
     std::int64_t walked = 0;
     {
         MutexLock lock(mutex_);
@@ -44,7 +45,7 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
             looking = Looking::everything;
         indices = list_.size();
         walked = store_.meta("walked", 0);
-        lost_changes_ = false;
+        losses = losses_;
     }
     auto opened = TreeWalker::open(device_);
     if (!opened)
@@ -115,7 +116,7 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
     give_back_reader(std::move(reader));
     queue_.wait_for(queue_.reported());
     MutexLock lock(mutex_);
-    if (lost_changes_ || !store_.is_open())
+    if (losses_ != losses || !store_.is_open())
         return ENOTSUP;
     if (list_.size() != indices)
         return EAGAIN;
@@ -136,6 +137,7 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
         return ENOTSUP;
     }
     found_unclean_ = false;
+    lost_changes_ = false;
     if (progress)
         (void)progress(count);
     return {};
