@@ -1,11 +1,9 @@
 #include <Archivable.h>
 
+#include "host/api/type_names.h"
 #include <ThreadSafety.h>
 
-#include <cxxabi.h>
 #include <map>
-#include <memory>
-#include <stdlib.h>
 #include <string>
 #include <typeinfo>
 
@@ -35,13 +33,6 @@ class Registry {
     std::map<std::string, instantiation_func> mFunctions GUARDED_BY(mMutex);
 };
 
-std::string ClassNameOf(const BArchivable& object) {
-    int status = 0;
-    const std::unique_ptr<char, void (*)(void*)> name(
-        abi::__cxa_demangle(typeid(object).name(), nullptr, nullptr, &status), free);
-    return name != nullptr ? name.get() : typeid(object).name();
-}
-
 } // namespace
 
 BArchivable::BArchivable() = default;
@@ -53,7 +44,7 @@ BArchivable::~BArchivable() = default;
 status_t BArchivable::Archive(BMessage* into, bool) const {
     if (into == nullptr)
         return B_BAD_VALUE;
-    const std::string name = ClassNameOf(*this);
+    const std::string name = host::type_name(typeid(*this));
     if (validate_instantiation(into, name.c_str()))
         return B_OK;
     return into->AddString(kClassField, name.c_str());
