@@ -9,6 +9,7 @@ enum : uint32 {
     B_APP_ACTIVATED = '_ACT',
     B_ARGV_RECEIVED = '_ARG',
     B_CANCEL = '_CNC',
+    B_HANDLERS_REQUESTED = '_HRQ',
     B_INVALIDATE = '_INV',
     B_KEY_DOWN = '_KYD',
     B_KEY_UP = '_KYU',
@@ -26,6 +27,8 @@ enum : uint32 {
     B_PRINTER_CHANGED = '_PCH',
     B_PULSE = '_PUL',
     B_QUIT_REQUESTED = '_QRQ',
+    // The older name of the same request.
+    B_CLOSE_REQUESTED = '_QRQ',
     B_READY_TO_RUN = '_RTR',
     B_REFS_RECEIVED = 'RRC_',
     B_SCREEN_CHANGED = '_SCH',

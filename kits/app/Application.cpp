@@ -90,8 +90,10 @@ BArchivable* BApplication::Instantiate(BMessage* from) {
 REGISTER_ARCHIVABLE(BApplication);
 
 status_t BApplication::Archive(BMessage* into, bool deep) const {
-    const status_t status = BLooper::Archive(into, deep);
-    return status == B_OK ? into->AddString("mime_sig", mSignature.c_str()) : status;
+    status_t status = BLooper::Archive(into, deep);
+    if (status == B_OK)
+        status = into->AddString("mime_sig", mSignature.c_str());
+    return status == B_OK && mPulseRate > 0 ? into->AddInt64("_pulse", mPulseRate) : status;
 }
 
 status_t BApplication::InitCheck() const {
@@ -150,7 +152,8 @@ void BApplication::Pulse() {}
 
 void BApplication::SetPulseRate(bigtime_t rate) {
     mPulse.reset();
-    if (rate <= 0)
+    mPulseRate = std::max(rate, bigtime_t{0});
+    if (mPulseRate == 0)
         return;
     BMessage pulse(B_PULSE);
     mPulse = std::make_unique<BMessageRunner>(BMessenger(this), &pulse, rate);

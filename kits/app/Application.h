@@ -50,7 +50,7 @@ class BApplication : public BLooper {
     // All loopers of the program, the application first. A looper may be gone before the caller looks at it.
     int32 CountLoopers() const;
     BLooper* LooperAt(int32 index) const;
-    // True until the thread runs.
+    // True until ReadyToRun() is called.
     bool IsLaunching() const;
     const char* Signature() const;
     bool HasSignature(const char* signature) const;
@@ -63,6 +63,7 @@ class BApplication : public BLooper {
     std::string mSignature;
     status_t mInitStatus = B_OK;
     std::atomic<bool> mReadyToRunCalled{false};
+    bigtime_t mPulseRate = 0;
     std::unique_ptr<BMessageRunner> mPulse;
 };
 

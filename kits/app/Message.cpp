@@ -33,6 +33,26 @@ BMessage& BMessage::operator=(const BMessage& other) {
     return *this;
 }
 
+BMessage::BMessage(BMessage&& other) noexcept {
+    Take(other);
+}
+
+BMessage& BMessage::operator=(BMessage&& other) noexcept {
+    if (this == &other)
+        return *this;
+    if (IsSourceWaiting())
+        SendReply(B_NO_REPLY);
+    Take(other);
+    return *this;
+}
+
+void BMessage::Take(BMessage& other) {
+    what = std::exchange(other.what, 0);
+    mFields = std::exchange(other.mFields, MessageFields());
+    mCurrentSpecifier = std::exchange(other.mCurrentSpecifier, -1);
+    mDelivery = std::exchange(other.mDelivery, Delivery());
+}
+
 status_t BMessage::GetInfo(type_code typeRequested, int32 index, char** nameFound, type_code* typeFound,
                            int32* countFound) const {
     if (index < 0)
@@ -115,7 +135,9 @@ bool BMessage::IsSourceWaiting() const {
 }
 
 bool BMessage::IsSourceRemote() const {
-    return mDelivery.delivered && !MessageDelivery::IsThisTeam(mDelivery.replyTo.team);
+    // Without a return address it came from here.
+    return mDelivery.delivered && mDelivery.replyTo.token != 0 &&
+           !MessageDelivery::IsThisTeam(mDelivery.replyTo.team);
 }
 
 BMessenger BMessage::ReturnAddress() const {
@@ -205,12 +227,10 @@ status_t BMessage::Unflatten(const char* buffer, size_t size) {
     BMessage read;
     const status_t status =
         buffer != nullptr ? unflatten_message({buffer, size}, &read.what, &read.mFields) : B_BAD_VALUE;
-    *this = BMessage();
-    what = read.what;
-    mFields = std::move(read.mFields);
     int32 specifiers = 0;
-    if (status == B_OK && GetInfo("specifiers", nullptr, &specifiers) == B_OK)
-        mCurrentSpecifier = specifiers - 1;
+    if (status == B_OK && read.GetInfo("specifiers", nullptr, &specifiers) == B_OK)
+        read.mCurrentSpecifier = specifiers - 1;
+    *this = std::move(read);
     return status;
 }
 

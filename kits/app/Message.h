@@ -48,6 +48,9 @@ class BMessage {
     explicit BMessage(uint32 code);
     // Copies `what` and the fields. How the other was delivered is not copied: a copy cannot be replied to.
     BMessage(const BMessage& other);
+    // Take the other's contents and its place in delivery, a reply that is owed included. It is left empty.
+    BMessage(BMessage&& other) noexcept;
+    BMessage& operator=(BMessage&& other) noexcept;
     // A message that was sent with its sender waiting, and has not been replied to, answers B_NO_REPLY as it
     // goes away.
     virtual ~BMessage();
@@ -241,9 +244,10 @@ class BMessage {
         MessengerAddress replyTo;
         BPoint dropPoint;
         BPoint dropOffset;
-        std::shared_ptr<BMessage> previous;
+        std::shared_ptr<const BMessage> previous;
     };
 
+    void Take(BMessage& other);
     status_t AddItem(const char* name, type_code type, std::span<const char> item, bool fixedSize,
                      int32 count = 1);
     status_t FindItem(const char* name, type_code type, int32 index, std::span<const char>* item) const;

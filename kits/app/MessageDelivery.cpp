@@ -124,10 +124,7 @@ status_t MessageDelivery::SendAndWait(const BMessage& message, const MessengerAd
         status = waiting.box->Wait(replyTimeout, &answer);
     if (status != B_OK)
         return status;
-    *reply = *answer;
-    // The reply may be answered in turn, and knows what it replies to; only its addressee changes objects.
-    reply->mDelivery = answer->mDelivery;
-    answer->mDelivery.sourceWaiting = false;
+    *reply = std::move(*answer);
     return B_OK;
 }
 
@@ -140,7 +137,7 @@ status_t MessageDelivery::Reply(BMessage& request, const BMessage& reply, const 
     std::unique_ptr<BMessage> copy =
         Address(reply, request.mDelivery.replyTo, ReplyAddress(replyTo), Waiting::none);
     copy->mDelivery.isReply = true;
-    copy->mDelivery.previous = std::make_shared<BMessage>(request);
+    copy->mDelivery.previous = std::make_shared<const BMessage>(request);
     request.mDelivery.replied = true;
     return SendAddressed(std::move(copy), timeout);
 }
@@ -155,7 +152,7 @@ status_t MessageDelivery::ReplyAndWait(BMessage& request, const BMessage& reply,
     std::unique_ptr<BMessage> copy =
         Address(reply, request.mDelivery.replyTo, waiting.Address(), Waiting::forReply);
     copy->mDelivery.isReply = true;
-    copy->mDelivery.previous = std::make_shared<BMessage>(request);
+    copy->mDelivery.previous = std::make_shared<const BMessage>(request);
     request.mDelivery.replied = true;
     status_t status = SendAddressed(std::move(copy), sendTimeout);
     std::unique_ptr<BMessage> answer;
@@ -163,8 +160,6 @@ status_t MessageDelivery::ReplyAndWait(BMessage& request, const BMessage& reply,
         status = waiting.box->Wait(replyTimeout, &answer);
     if (status != B_OK)
         return status;
-    *replyToReply = *answer;
-    replyToReply->mDelivery = answer->mDelivery;
-    answer->mDelivery.sourceWaiting = false;
+    *replyToReply = std::move(*answer);
     return B_OK;
 }

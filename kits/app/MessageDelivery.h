@@ -6,8 +6,9 @@
 
 // The one place that turns an address into a queue, and the one that writes how a message was delivered.
 // Addresses of this process are resolved through the TokenTable and the message is copied, not flattened.
-// Addresses of other teams are refused with B_BAD_TEAM_ID: transport between processes (a flattened message,
-// the target's token and the return address) is to be added in Send() and Reply(), nowhere else. Any thread.
+// Addresses of other teams are refused with B_BAD_TEAM_ID in SendAddressed(), through which every message
+// passes that does not come by Post(): a transport between processes (a flattened message, the target's token
+// and the return address) would begin there, and end in a call of it. Any thread.
 class MessageDelivery {
   public:
     enum class Waiting { none, forReply };
@@ -41,5 +42,6 @@ class MessageDelivery {
   private:
     static std::unique_ptr<BMessage> Address(const BMessage& message, const MessengerAddress& target,
                                              const MessengerAddress& replyTo, Waiting waiting);
+    // To the target that Address() has written into the message.
     static status_t SendAddressed(std::unique_ptr<BMessage> message, bigtime_t timeout);
 };
