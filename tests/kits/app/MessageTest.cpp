@@ -43,14 +43,41 @@ TEST(MessageTest, CodesOfAnUnderscoreAndCapitalsAreTheSystems) {
 
 TEST(MessageTest, SystemCodesHaveThePlatformsValues) {
     EXPECT_EQ(uint32{B_QUIT_REQUESTED}, 0x5f515251U); // _QRQ
-    EXPECT_EQ(uint32{B_REFS_RECEIVED}, 0x5f525243U);  // _RRC
-    EXPECT_EQ(uint32{B_PULSE}, 0x5f50554cU);          // _PUL
-    EXPECT_EQ(uint32{B_QUERY_UPDATE}, 0x51555044U);   // QUPD
-    EXPECT_EQ(uint32{B_NODE_MONITOR}, 0x4e444d4eU);   // NDMN
-    EXPECT_EQ(uint32{B_SIMPLE_DATA}, 0x44415441U);    // DATA
-    EXPECT_EQ(uint32{B_REPLY}, 0x52504c59U);          // RPLY
-    EXPECT_EQ(uint32{B_NO_REPLY}, 0x4e4f4e45U);       // NONE
+    EXPECT_EQ(uint32{B_REFS_RECEIVED}, 0x5252435fU);  // RRC_
+    EXPECT_EQ(uint32{B_CLOSE_REQUESTED}, 0x5f515251U);
+    EXPECT_EQ(uint32{B_HANDLERS_REQUESTED}, 0x5f485251U); // _HRQ
+    EXPECT_EQ(uint32{B_PULSE}, 0x5f50554cU);              // _PUL
+    EXPECT_EQ(uint32{B_QUERY_UPDATE}, 0x51555044U);       // QUPD
+    EXPECT_EQ(uint32{B_NODE_MONITOR}, 0x4e444d4eU);       // NDMN
+    EXPECT_EQ(uint32{B_SIMPLE_DATA}, 0x44415441U);        // DATA
+    EXPECT_EQ(uint32{B_REPLY}, 0x52504c59U);              // RPLY
+    EXPECT_EQ(uint32{B_NO_REPLY}, 0x4e4f4e45U);           // NONE
     EXPECT_EQ(uint32{B_MESSAGE_NOT_UNDERSTOOD}, 0x4d4e4f54U);
+}
+
+TEST(MessageTest, AMoveTakesEverythingAndLeavesTheOtherEmpty) {
+    BMessage source('from');
+    source.AddString("s", "text");
+    source.AddSpecifier("Property");
+    BMessage moved(std::move(source));
+    EXPECT_EQ(moved.what, uint32{'from'});
+    EXPECT_STREQ(moved.GetString("s"), "text");
+    EXPECT_TRUE(moved.HasSpecifiers());
+    EXPECT_EQ(source.what, 0U);
+    EXPECT_TRUE(source.IsEmpty());
+    EXPECT_FALSE(source.HasSpecifiers());
+
+    BMessage assigned('old_');
+    assigned.AddInt32("n", 1);
+    assigned = std::move(moved);
+    EXPECT_EQ(assigned.what, uint32{'from'});
+    EXPECT_FALSE(assigned.HasInt32("n"));
+    EXPECT_STREQ(assigned.GetString("s"), "text");
+    EXPECT_TRUE(moved.IsEmpty());
+
+    // What has been moved from can be used again.
+    moved.AddInt32("n", 7);
+    EXPECT_EQ(moved.GetInt32("n", 0), 7);
 }
 
 TEST(MessageTest, NamesKeepTheOrderOfTheirFirstAddition) {
