@@ -1,4 +1,4 @@
-// Messages posted from one looper to another a second.
+// Messages posted from one looper to another, and questions answered, a second.
 #include "support/Figures.h"
 
 #include <Looper.h>
@@ -13,6 +13,8 @@ namespace {
 constexpr int32 kMessages = 300'000;
 constexpr int kRounds = 5;
 constexpr double kPostsPerSecond = 500'000;
+constexpr int32 kRoundTrips = 50'000;
+constexpr double kRoundTripsPerSecond = 50'000;
 
 class Receiver : public BLooper {
   public:
@@ -74,6 +76,42 @@ double PostsPerSecond(bool withField) {
     return bench::Median(rates);
 }
 
+// Answers each message with its number plus one.
+class Answering : public BLooper {
+  public:
+    Answering() : BLooper("answering") {}
+    void MessageReceived(BMessage* message) override {
+        BMessage reply(B_REPLY);
+        int32 number = 0;
+        if (message->FindInt32("n", &number) == B_OK)
+            reply.AddInt32("n", number + 1);
+        message->SendReply(&reply);
+    }
+};
+
+// Synchronous sends from this thread, each waiting for its reply. 0 when one of them fails.
+double RoundTripsPerSecond(bool withField) {
+    auto* const answering = new Answering;
+    answering->Run();
+    const BMessenger messenger(answering);
+    std::vector<double> rates;
+    bool answered = true;
+    for (int round = 1; round <= kRounds; round++) {
+        const bench::Stopwatch watch;
+        for (int32 number = 0; number < kRoundTrips; number++) {
+            BMessage message('ask_');
+            if (withField)
+                message.AddInt32("n", number);
+            BMessage reply;
+            answered &= messenger.SendMessage(&message, &reply) == B_OK && reply.what == B_REPLY &&
+                        (!withField || reply.GetInt32("n", 0) == number + 1);
+        }
+        rates.push_back(kRoundTrips / watch.Seconds());
+    }
+    QuitLooper(answering);
+    return answered ? bench::Median(rates) : 0;
+}
+
 } // namespace
 
 int main() {
@@ -81,5 +119,9 @@ int main() {
                                  kPostsPerSecond, 1, bench::Better::higher);
     reached &= bench::Report("post, one number", PostsPerSecond(true), "messages/s", "wanted",
                              kPostsPerSecond, 1, bench::Better::higher);
+    reached &= bench::Report("question and answer, no fields", RoundTripsPerSecond(false), "a second",
+                             "wanted", kRoundTripsPerSecond, 1, bench::Better::higher);
+    reached &= bench::Report("question and answer, one number", RoundTripsPerSecond(true), "a second",
+                             "wanted", kRoundTripsPerSecond, 1, bench::Better::higher);
     return reached ? 0 : 1;
 }
