@@ -6,12 +6,18 @@
 
 #include <cstdio>
 
+namespace {
+
+constexpr const char* kCapacityField = "_port_cap";
+
+} // namespace
+
 BLooper::BLooper(const char* name, int32 priority, int32 portCapacity) : BHandler(name), mPriority(priority) {
     InitialiseLooper(portCapacity);
 }
 
 BLooper::BLooper(BMessage* from) : BHandler(from) {
-    InitialiseLooper(from != nullptr ? from->GetInt32("_port_cap", B_LOOPER_PORT_DEFAULT_CAPACITY)
+    InitialiseLooper(from != nullptr ? from->GetInt32(kCapacityField, B_LOOPER_PORT_DEFAULT_CAPACITY)
                                      : B_LOOPER_PORT_DEFAULT_CAPACITY);
 }
 
@@ -45,7 +51,10 @@ BArchivable* BLooper::Instantiate(BMessage* from) {
 REGISTER_ARCHIVABLE(BLooper);
 
 status_t BLooper::Archive(BMessage* into, bool deep) const {
-    return BHandler::Archive(into, deep);
+    const status_t status = BHandler::Archive(into, deep);
+    if (status != B_OK || mState->capacity == B_LOOPER_PORT_DEFAULT_CAPACITY)
+        return status;
+    return into->AddInt32(kCapacityField, mState->capacity);
 }
 
 status_t BLooper::PostMessage(uint32 command) {

@@ -27,7 +27,7 @@ status_t LooperState::Deliver(std::unique_ptr<BMessage> message, bigtime_t timeo
             departures = mDepartures;
         }
         // Not under the bell's mutex: whoever holds the queue may be ringing.
-        if (queue.CountMessages() < mCapacity)
+        if (queue.CountMessages() < capacity)
             break;
         if (timeout <= 0)
             return B_WOULD_BLOCK;

@@ -13,9 +13,8 @@ class BLooper;
 // looper that is gone. Any thread.
 class LooperState {
   public:
-    // `capacity` is the number of queued messages from which on a delivery with a time-out waits.
-    LooperState(BLooper* owner, int32 ownerToken, int32 capacity)
-        : looper(owner), token(ownerToken), mCapacity(capacity) {}
+    LooperState(BLooper* owner, int32 ownerToken, int32 queueCapacity)
+        : looper(owner), token(ownerToken), capacity(queueCapacity) {}
 
     // Queues the message however many wait already: what is posted is never lost. B_BAD_PORT_ID once the
     // looper is going away.
@@ -33,6 +32,8 @@ class LooperState {
     BLooper* const looper;
     // The looper's own, as a handler.
     const int32 token;
+    // The number of queued messages from which on a delivery with a time-out waits.
+    const int32 capacity;
     LooperLock lock;
     BMessageQueue queue;
     // 0 until the looper runs.
@@ -41,7 +42,6 @@ class LooperState {
   private:
     void Ring();
 
-    const int32 mCapacity;
     // Changed with the queue locked, so that no message slips in behind the last one.
     std::atomic<bool> mClosed{false};
     GuardMutex mBellMutex;

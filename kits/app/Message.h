@@ -85,8 +85,8 @@ class BMessage {
     // In screen coordinates; `offset` receives where in the dragged picture the pointer was.
     BPoint DropPoint(BPoint* offset = nullptr) const;
 
-    // B_BAD_REPLY for a message that was not delivered, B_DUPLICATE_REPLY for a second reply to a waiting
-    // sender, otherwise as BMessenger::SendMessage().
+    // B_BAD_REPLY for a message that was not delivered or has no return address, B_DUPLICATE_REPLY for a
+    // second reply to a waiting sender, otherwise as BMessenger::SendMessage().
     status_t SendReply(uint32 command, BHandler* replyTo = nullptr);
     status_t SendReply(BMessage* reply, BHandler* replyTo = nullptr, bigtime_t timeout = B_INFINITE_TIMEOUT);
     status_t SendReply(BMessage* reply, BMessenger replyTo, bigtime_t timeout = B_INFINITE_TIMEOUT);

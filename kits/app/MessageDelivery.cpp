@@ -26,6 +26,13 @@ MessengerAddress ReplyAddress(const MessengerAddress& replyTo) {
     return {ThisTeam(), token, true};
 }
 
+// Whether the target's looper runs in the calling thread, which must not wait for it then.
+bool IsThisThread(const MessengerAddress& target) {
+    const TokenTable::Target found =
+        target.team == ThisTeam() ? TokenTable::Instance().Find(target.token) : TokenTable::Target();
+    return found.looper != nullptr && found.looper->thread == current_thread_identity();
+}
+
 // A reply box under its token, for as long as somebody waits at it.
 class RegisteredReplyBox {
   public:
@@ -109,57 +116,61 @@ status_t MessageDelivery::Post(const BMessage& message, LooperState& looper, int
     return looper.Post(Address(message, address, ReplyAddress(replyTo), Waiting::none));
 }
 
+// Sends a message whose replies go to `waiting`, and waits there.
+status_t MessageDelivery::Exchange(std::unique_ptr<BMessage> message, ReplyBox& waiting, BMessage* reply,
+                                   bigtime_t sendTimeout, bigtime_t replyTimeout) {
+    std::unique_ptr<BMessage> answer;
+    status_t status = SendAddressed(std::move(message), sendTimeout);
+    if (status == B_OK)
+        status = waiting.Wait(replyTimeout, &answer);
+    if (status == B_OK)
+        *reply = std::move(*answer);
+    return status;
+}
+
 status_t MessageDelivery::SendAndWait(const BMessage& message, const MessengerAddress& target,
                                       BMessage* reply, bigtime_t deliveryTimeout, bigtime_t replyTimeout) {
     if (reply == nullptr)
         return B_BAD_VALUE;
-    const TokenTable::Target found = TokenTable::Instance().Find(target.token);
-    if (IsThisTeam(target.team) && found.looper && found.looper->thread == current_thread_identity())
+    if (IsThisThread(target))
         return B_MESSAGE_TO_SELF;
     RegisteredReplyBox waiting;
-    status_t status =
-        SendAddressed(Address(message, target, waiting.Address(), Waiting::forReply), deliveryTimeout);
-    std::unique_ptr<BMessage> answer;
-    if (status == B_OK)
-        status = waiting.box->Wait(replyTimeout, &answer);
-    if (status != B_OK)
-        return status;
-    *reply = std::move(*answer);
-    return B_OK;
+    return Exchange(Address(message, target, waiting.Address(), Waiting::forReply), *waiting.box, reply,
+                    deliveryTimeout, replyTimeout);
+}
+
+// B_OK when the request can be replied to (again).
+status_t MessageDelivery::MayReply(const BMessage& request) {
+    if (!request.mDelivery.delivered || request.mDelivery.replyTo.token == 0)
+        return B_BAD_REPLY;
+    return request.mDelivery.sourceWaiting && request.mDelivery.replied ? B_DUPLICATE_REPLY : B_OK;
+}
+
+std::unique_ptr<BMessage> MessageDelivery::AddressReply(BMessage& request, const BMessage& reply,
+                                                        const MessengerAddress& replyTo, Waiting waiting) {
+    std::unique_ptr<BMessage> copy = Address(reply, request.mDelivery.replyTo, replyTo, waiting);
+    copy->mDelivery.isReply = true;
+    copy->mDelivery.previous = std::make_shared<const BMessage>(request);
+    request.mDelivery.replied = true;
+    return copy;
 }
 
 status_t MessageDelivery::Reply(BMessage& request, const BMessage& reply, const MessengerAddress& replyTo,
                                 bigtime_t timeout) {
-    if (!request.mDelivery.delivered || request.mDelivery.replyTo.token == 0)
-        return B_BAD_REPLY;
-    if (request.mDelivery.sourceWaiting && request.mDelivery.replied)
-        return B_DUPLICATE_REPLY;
-    std::unique_ptr<BMessage> copy =
-        Address(reply, request.mDelivery.replyTo, ReplyAddress(replyTo), Waiting::none);
-    copy->mDelivery.isReply = true;
-    copy->mDelivery.previous = std::make_shared<const BMessage>(request);
-    request.mDelivery.replied = true;
-    return SendAddressed(std::move(copy), timeout);
+    const status_t status = MayReply(request);
+    if (status != B_OK)
+        return status;
+    return SendAddressed(AddressReply(request, reply, ReplyAddress(replyTo), Waiting::none), timeout);
 }
 
 status_t MessageDelivery::ReplyAndWait(BMessage& request, const BMessage& reply, BMessage* replyToReply,
                                        bigtime_t sendTimeout, bigtime_t replyTimeout) {
-    if (!request.mDelivery.delivered || request.mDelivery.replyTo.token == 0)
-        return B_BAD_REPLY;
-    if (request.mDelivery.sourceWaiting && request.mDelivery.replied)
-        return B_DUPLICATE_REPLY;
-    RegisteredReplyBox waiting;
-    std::unique_ptr<BMessage> copy =
-        Address(reply, request.mDelivery.replyTo, waiting.Address(), Waiting::forReply);
-    copy->mDelivery.isReply = true;
-    copy->mDelivery.previous = std::make_shared<const BMessage>(request);
-    request.mDelivery.replied = true;
-    status_t status = SendAddressed(std::move(copy), sendTimeout);
-    std::unique_ptr<BMessage> answer;
-    if (status == B_OK)
-        status = waiting.box->Wait(replyTimeout, &answer);
+    const status_t status = MayReply(request);
     if (status != B_OK)
         return status;
-    *replyToReply = std::move(*answer);
-    return B_OK;
+    if (IsThisThread(request.mDelivery.replyTo))
+        return B_MESSAGE_TO_SELF;
+    RegisteredReplyBox waiting;
+    return Exchange(AddressReply(request, reply, waiting.Address(), Waiting::forReply), *waiting.box,
+                    replyToReply, sendTimeout, replyTimeout);
 }

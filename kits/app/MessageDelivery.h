@@ -4,6 +4,8 @@
 #include "LooperState.h"
 #include <Messenger.h>
 
+class ReplyBox;
+
 // The one place that turns an address into a queue, and the one that writes how a message was delivered.
 // Addresses of this process are resolved through the TokenTable and the message is copied, not flattened.
 // Addresses of other teams are refused with B_BAD_TEAM_ID in SendAddressed(), through which every message
@@ -44,4 +46,10 @@ class MessageDelivery {
                                              const MessengerAddress& replyTo, Waiting waiting);
     // To the target that Address() has written into the message.
     static status_t SendAddressed(std::unique_ptr<BMessage> message, bigtime_t timeout);
+    static status_t Exchange(std::unique_ptr<BMessage> message, ReplyBox& waiting, BMessage* reply,
+                             bigtime_t sendTimeout, bigtime_t replyTimeout);
+    static status_t MayReply(const BMessage& request);
+    // Marks the request as replied to.
+    static std::unique_ptr<BMessage> AddressReply(BMessage& request, const BMessage& reply,
+                                                  const MessengerAddress& replyTo, Waiting waiting);
 };

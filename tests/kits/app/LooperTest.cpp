@@ -190,6 +190,58 @@ TEST(LooperTest, AQuitThatIsRefusedIsAnsweredAndTheLooperGoesOn) {
     EXPECT_EQ(seen.destroyed, 1);
 }
 
+TEST(LooperTest, AnArchiveKeepsNameAndCapacity) {
+    Seen seen;
+    BLooper* looper = new BLooper("archived", B_NORMAL_PRIORITY, 3);
+    BMessage archive;
+    ASSERT_EQ(looper->Archive(&archive), B_OK);
+    looper->Quit();
+    EXPECT_STREQ(archive.GetString("class"), "BLooper");
+    EXPECT_EQ(archive.GetInt32("_port_cap", 0), 3);
+
+    auto* again = dynamic_cast<BLooper*>(instantiate_object(&archive));
+    ASSERT_NE(again, nullptr);
+    EXPECT_STREQ(again->Name(), "archived");
+    BMessage work('work');
+    const BMessenger messenger(again);
+    for (int count = 0; count < 3; count++)
+        EXPECT_EQ(messenger.SendMessage(&work, BMessenger(), 0), B_OK);
+    EXPECT_EQ(messenger.SendMessage(&work, BMessenger(), 0), B_WOULD_BLOCK);
+    again->Quit();
+}
+
+TEST(LooperTest, ScriptsCountHandlersAndReachThemByIndexAndName) {
+    Seen seen;
+    BHandler named("painter");
+    BLooper* looper = new CountingLooper(seen);
+    looper->AddHandler(&named);
+    const BMessenger messenger(looper);
+    looper->Run();
+
+    BMessage handler(B_GET_PROPERTY);
+    BMessage answer;
+    handler.AddSpecifier("InternalName");
+    handler.AddSpecifier("Handler", "painter");
+    ASSERT_EQ(messenger.SendMessage(&handler, &answer), B_OK);
+    EXPECT_STREQ(answer.GetString("result"), "painter");
+
+    BMessage byIndex(B_GET_PROPERTY);
+    byIndex.AddSpecifier("InternalName");
+    byIndex.AddSpecifier("Handler", 1);
+    ASSERT_EQ(messenger.SendMessage(&byIndex, &answer), B_OK);
+    EXPECT_STREQ(answer.GetString("result"), "painter");
+
+    BMessage absent(B_GET_PROPERTY);
+    absent.AddSpecifier("InternalName");
+    absent.AddSpecifier("Handler", "sculptor");
+    ASSERT_EQ(messenger.SendMessage(&absent, &answer), B_OK);
+    EXPECT_EQ(answer.what, uint32{B_MESSAGE_NOT_UNDERSTOOD});
+    EXPECT_EQ(answer.GetInt32("error", 0), B_NAME_NOT_FOUND);
+
+    ASSERT_TRUE(looper->Lock());
+    looper->Quit();
+}
+
 TEST(LooperTest, ALooperRunsOnce) {
     Seen seen;
     BLooper* looper = new CountingLooper(seen);
