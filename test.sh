@@ -33,18 +33,32 @@ step() {
     fi
 }
 
-run_preset() {
-    local preset=$1 only=$2
+# configure_and_build PRESET [CMAKE --BUILD ARGUMENT...]
+configure_and_build() {
+    local preset=$1
+    shift
     cmake --preset "$preset" >"$results/$preset-configure.log" 2>&1 || { cat "$results/$preset-configure.log"; return 1; }
-    cmake --build --preset "$preset" >"$results/$preset-build.log" 2>&1 || { tail -n 60 "$results/$preset-build.log"; return 1; }
-    GTEST_OUTPUT="xml:$results/$preset/" ctest --preset "$preset" -j "$(nproc)" --no-tests=error -L "$only" ||
-        return 1
+    cmake --build --preset "$preset" "$@" >"$results/$preset-build.log" 2>&1 || { tail -n 60 "$results/$preset-build.log"; return 1; }
+}
+
+run_dev() {
+    configure_and_build dev || return 1
+    GTEST_OUTPUT="xml:$results/dev/" ctest --preset dev -j "$(nproc)" --no-tests=error -L "$labels"
+}
+
+# The programs whose code runs in several threads.
+threaded=(test_kits_support test_kits_kernel test_kits_app test_kits_interface test_host_linux test_host_threads
+          test_host_sqlite test_indexing test_kits_app_races test_kits_kernel_races test_index_write_fault)
+
+run_tsan() {
+    configure_and_build tsan --target "${threaded[@]}" || return 1
+    GTEST_OUTPUT="xml:$results/tsan/" ctest --preset tsan -j "$(nproc)" --no-tests=error \
+        -R "^($(IFS='|'; echo "${threaded[*]}"))\$"
 }
 
 run_fuzzers() {
-    cmake --preset fuzz >"$results/fuzz-configure.log" 2>&1 || { cat "$results/fuzz-configure.log"; return 1; }
-    cmake --build --preset fuzz --target fuzzers >"$results/fuzz-build.log" 2>&1 || { tail -n 60 "$results/fuzz-build.log"; return 1; }
-    tests/fuzz/run-fuzzers build/fuzz/tests/fuzz "${QUIRNEL_FUZZ_SECONDS:-15}"
+    configure_and_build fuzz --target fuzzers || return 1
+    ctest --test-dir build/fuzz -j "$(nproc)" --no-tests=error --output-on-failure -R 'fuzzer$'
 }
 
 check_format() {
@@ -56,8 +70,8 @@ step "layers check catches a breach" tests/tools/check-layers-test
 if command -v clang-format >/dev/null && git rev-parse --git-dir >/dev/null 2>&1; then
     step "format" check_format
 fi
-step "tests under AddressSanitizer and UndefinedBehaviorSanitizer" run_preset dev "$labels"
-step "tests under ThreadSanitizer" run_preset tsan '^quick$'
+step "tests under AddressSanitizer and UndefinedBehaviorSanitizer" run_dev
+step "tests under ThreadSanitizer" run_tsan
 step "fuzzers" run_fuzzers
 step "the tour, as ./run.sh shows it" ./run.sh
 

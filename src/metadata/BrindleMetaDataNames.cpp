@@ -80,11 +80,9 @@ status_t BrindleMetaData::ReadMetaFilename(entry_ref* ref) {
 }
 
 void BrindleMetaData::ReadFolderName(const BEntry& entry) {
-    BDirectory folder;
-    BEntry folderEntry;
+    BEntry folder;
     char folderName[B_FILE_NAME_LENGTH];
-    if (entry.GetParent(&folder) == B_OK && folder.GetEntry(&folderEntry) == B_OK &&
-        folderEntry.GetName(folderName) == B_OK)
+    if (entry.GetParent(&folder) == B_OK && folder.GetName(folderName) == B_OK)
         ParseDirName(folderName);
 }
 
