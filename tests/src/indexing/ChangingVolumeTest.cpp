@@ -160,6 +160,25 @@ TEST_F(ChangingVolume, AJobWhoseQueryFailsSaysSoAndKeepsTheWordsOfARunningOne) {
     EXPECT_EQ(StatusTextOf(*item), "Indexing files (0)");
 }
 
+TEST_F(ChangingVolume, ARowOfAVolumeThatHasGoneSaysThatItFoundNoIcon) {
+    const std::string root = TestVolumes::Instance().Passing();
+    const auto item = MakeItem(root);
+    auto entry = std::make_unique<VolumeListEntry>();
+    entry->query = std::make_unique<BQuery>();
+    entry->volume = std::make_unique<BVolume>(*item->Entry().volume);
+    std::filesystem::remove_all(root);
+
+    CapturedOutput output;
+    const FileIndexListItem gone(entry.release());
+    const std::string text = output.text();
+    std::filesystem::create_directory(root);
+
+    EXPECT_EQ(text, "can't get icon for volume\n");
+    EXPECT_EQ(gone.Icon(), nullptr);
+    EXPECT_FALSE(gone.IsSupported());
+    EXPECT_NE(item->Icon(), nullptr);
+}
+
 TEST_F(ChangingVolume, AJobEndsOnAVolumeThatGoesAway) {
     const std::string root = TestVolumes::Instance().Passing();
     for (int i = 0; i < 500; ++i) {
