@@ -413,6 +413,18 @@ TEST_F(BrindleMetaDataCoverAttribute, IsCutAfterTenThousandBytesAndThenInvalid) 
     EXPECT_FALSE(mRecord.mCover64x64bitmap->IsValid());
 }
 
+TEST_F(BrindleMetaDataCoverAttribute, IsNotWrittenWhenTheCoverCannotBeLocked) {
+    mRecord.mCover64x64bitmap = new BBitmap(BRect(0, 0, 64, 64), B_RGB16, false, false);
+    ASSERT_FALSE(mRecord.mCover64x64bitmap->Lock());
+    const entry_ref ref = RefOf(mPath);
+    BNode node(&ref);
+
+    mRecord.WriteMetaAttributes(&node);
+
+    EXPECT_EQ(RawAttribute(mPath, "Media:64x64CoverImage"), std::nullopt);
+    EXPECT_EQ(Text(mPath, "Audio:Length"), " 0:00");
+}
+
 TEST_F(BrindleMetaDataCoverAttribute, TakesThePlaceOfTheCoverBefore) {
     WriteCover(65);
     mRecord.mCover64x64bitmap = Painted(3).release();

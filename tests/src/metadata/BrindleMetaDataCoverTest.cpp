@@ -8,6 +8,8 @@
 #include <Bitmap.h>
 #include <CopyText.h>
 #include <Message.h>
+#include <Node.h>
+#include <NodeInfo.h>
 
 #include <memory>
 #include <string>
@@ -99,6 +101,20 @@ TEST_F(TrackPicture, WritesTheAttributesOfTheTrackAndNotOfTheImage) {
     EXPECT_EQ(Text(mTrack, "Audio:Length"), " 0:00");
     EXPECT_TRUE(RawAttribute(mTrack, "Media:64x64CoverImage").has_value());
     EXPECT_TRUE(AttributeNames(image).empty());
+}
+
+TEST_F(TrackPicture, GivesTheTrackItsMiniIcon) {
+    const entry_ref ref = RefOf(mTrack);
+    BNode node(&ref);
+    const BNodeInfo nodeInfo(&node);
+    BBitmap icon(BRect(0, 0, 15, 15), B_CMAP8);
+    ASSERT_NE(nodeInfo.GetIcon(&icon, B_MINI_ICON), B_OK);
+
+    ASSERT_EQ(SetFrom(MakeFile("cover.png", Bytes(kRedAndBluePng))), 0);
+
+    ASSERT_EQ(nodeInfo.GetIcon(&icon, B_MINI_ICON), B_OK);
+    const auto* bits = static_cast<const uint8*>(icon.Bits());
+    EXPECT_NE(bits[8 * icon.BytesPerRow()], bits[8 * icon.BytesPerRow() + 15]) << "red left, blue right";
 }
 
 TEST_F(TrackPicture, IsReadBackFromTheTrack) {

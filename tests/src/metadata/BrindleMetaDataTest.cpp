@@ -236,6 +236,20 @@ TEST(BrindleMetaDataMessage, HoldsCoversBeforeTheFilename) {
                                         "cover64x64 MSGG", "cover16x16 MSGG", "filename CSTR"}));
 }
 
+TEST(BrindleMetaDataMessage, HoldsAnEmptyMessageForACoverThatCannotBeLocked) {
+    BrindleMetaData record;
+    record.mCover64x64bitmap = new BBitmap(BRect(0, 0, 64, 64), B_RGB16, false, false);
+    ASSERT_FALSE(record.mCover64x64bitmap->Lock());
+    BMessage message;
+
+    record.SaveIntoMessage(&message);
+
+    BMessage cover;
+    ASSERT_EQ(message.FindMessage("cover64x64", &cover), B_OK);
+    EXPECT_TRUE(cover.IsEmpty());
+    EXPECT_FALSE(message.HasMessage("cover16x16"));
+}
+
 TEST(BrindleMetaDataMessage, SavingIntoNoMessageDoesNothing) {
     const BrindleMetaData record;
     record.SaveIntoMessage(nullptr);
