@@ -15,8 +15,11 @@ void Note(int signal) {
 } // namespace
 
 void CatchInterruptions() {
-    for (const int signal : {SIGINT, SIGTERM, SIGHUP})
-        std::signal(signal, Note);
+    for (const int signal : {SIGINT, SIGTERM, SIGHUP}) {
+        // What the caller had ignored stays so: the hang-up of a job under nohup.
+        if (std::signal(signal, Note) == SIG_IGN)
+            std::signal(signal, SIG_IGN);
+    }
 }
 
 bool Interrupted() {

@@ -10,6 +10,8 @@
 
 namespace {
 
+constexpr char kNoVolumeAnswers[] = "no volume here answers queries";
+
 /// Lists refs once each, as paths or as a table of fields.
 class HitList {
   public:
@@ -45,6 +47,7 @@ int FindSongs(const Request& request, Output& output) {
     if (request.arguments.size() != 1)
         return Fail("find takes one text");
     HitList hits(request, output);
+    bool answered = false;
     for (const ChosenVolume& volume : AllVolumes()) {
         if (!volume.volume.KnowsQuery())
             continue;
@@ -54,10 +57,13 @@ int FindSongs(const Request& request, Output& output) {
         // As in the window, a volume that cannot answer adds nothing.
         if (query.Fetch() != B_OK)
             continue;
+        answered = true;
         entry_ref ref;
         while (query.GetNextRef(&ref) == B_OK)
             hits.Add(ref);
     }
+    if (!answered)
+        return Fail(kNoVolumeAnswers);
     hits.Finish();
     return 0;
 }
@@ -73,6 +79,8 @@ int QueryFiles(const Request& request, Output& output) {
             if (volume.volume.KnowsQuery())
                 volumes.push_back(volume);
         }
+        if (volumes.empty())
+            return Fail(kNoVolumeAnswers);
     } else if (const auto named = VolumesOf(roots, problem)) {
         volumes = *named;
     } else {

@@ -5,6 +5,7 @@
 #include <Entry.h>
 #include <Path.h>
 #include <VolumeRoster.h>
+#include <algorithm>
 #include <array>
 
 namespace {
@@ -56,7 +57,11 @@ std::optional<std::vector<ChosenVolume>> VolumesOf(const std::vector<std::string
                                         "BEKITS_VOLUMES or ~/.config/bekits/volumes declares more";
             return std::nullopt;
         }
-        chosen.push_back(*found);
+        const bool is_chosen = std::any_of(chosen.begin(), chosen.end(), [&](const ChosenVolume& volume) {
+            return volume.volume == found->volume;
+        });
+        if (!is_chosen)
+            chosen.push_back(*found);
     }
     return chosen;
 }

@@ -6,9 +6,12 @@
 #include <Volume.h>
 #include <VolumeRoster.h>
 #include <array>
+#include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <fcntl.h>
 #include <string_view>
+#include <unistd.h>
 
 namespace {
 
@@ -39,21 +42,23 @@ constexpr char kUsage[] =
 struct Command {
     std::string_view name;
     int (*run)(const Request&, Output&);
-    /// The application's start-up work comes first: indices on the volumes, columns for the file manager.
+    /// Columns for the file manager come first, as at the application's start.
     bool writes;
+    /// Indices on the volumes come first, as at the application's start: without one nothing is found.
+    bool indexes;
     /// What other programs did to the files since the index last looked is taken in first.
     bool searches;
 };
 
 constexpr std::array<Command, 8> kCommands = {{
-    {"volumes", ListVolumes, false, false},
-    {"index", IndexVolumes, true, false},
-    {"strip", StripVolumes, false, false},
-    {"find", FindSongs, false, true},
-    {"query", QueryFiles, false, true},
-    {"attr", ShowAttributes, false, false},
-    {"cover", SetCover, true, false},
-    {"reindex", ReindexVolumes, true, false},
+    {"volumes", ListVolumes, false, false, false},
+    {"index", IndexVolumes, true, true, false},
+    {"strip", StripVolumes, false, false, false},
+    {"find", FindSongs, false, true, true},
+    {"query", QueryFiles, false, true, true},
+    {"attr", ShowAttributes, false, false, false},
+    {"cover", SetCover, true, true, false},
+    {"reindex", ReindexVolumes, true, true, false},
 }};
 
 /// An empty text, or what is wrong with the command line.
@@ -92,14 +97,31 @@ void TakeInChanges() {
     }
 }
 
+// A standard descriptor that the caller had closed would be given to the next file that is opened, such as
+// the index, and then written to. Results that have nowhere to go are an error.
+void KeepStandardDescriptorsTaken() {
+    for (const int descriptor : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
+        if (fcntl(descriptor, F_GETFD) >= 0 || errno != EBADF)
+            continue;
+        // The lowest free number is this one.
+        if (open(descriptor == STDOUT_FILENO ? "/dev/full" : "/dev/null", O_RDWR) < 0)
+            return;
+    }
+}
+
+int PrintUsage() {
+    std::fputs(kUsage, stdout);
+    return std::fflush(stdout) == 0 ? 0 : Fail("the results could not be written");
+}
+
 int Run(const Command& command, const Request& request, Output& output) {
     output.Silence(request.verbose);
     QuirnelApp app;
     brindle_app = &app;
-    if (command.writes) {
+    if (command.writes)
         app.CheckTrackerDisplayAttributes();
+    if (command.indexes)
         app.CheckCreateIndices();
-    }
     if (command.searches)
         TakeInChanges();
     const int status = command.run(request, output);
@@ -115,10 +137,10 @@ int Fail(const std::string& text) {
 }
 
 int main(int count, char** arguments) {
+    KeepStandardDescriptorsTaken();
     for (int at = 1; at < count; ++at) {
         if (std::strcmp(arguments[at], "--help") == 0 || std::strcmp(arguments[at], "-h") == 0) {
-            std::fputs(kUsage, stdout);
-            return 0;
+            return PrintUsage();
         }
         if (std::strcmp(arguments[at], "--") == 0)
             break;

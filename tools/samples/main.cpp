@@ -14,7 +14,8 @@ int main(int argc, char** argv) {
         content.frames = static_cast<int>(std::strtol(argv[3], &end, 10));
         content.tags = samples::Sample::Tags::before;
     }
-    if (argc < 2 || argc > 4 || bad_count || (argc == 4 && (content.frames <= 0 || *end != '\0'))) {
+    if (argc < 2 || argc > 4 || argv[1][0] == '-' || bad_count ||
+        (argc == 4 && (content.frames <= 0 || *end != '\0'))) {
         std::fprintf(
             stderr,
             "usage: sample-library FOLDER [COUNT [FRAMES]]\n"

@@ -1,0 +1,88 @@
+// quirnelctl in surroundings that a shell, a service or a full disk gives it.
+#include "support/program.h"
+#include "support/temporary_environment.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <csignal>
+#include <filesystem>
+#include <fstream>
+#include <unistd.h>
+
+namespace {
+
+class Surroundings : public ::testing::Test {
+  protected:
+    // A line of the shell, in which $0 is the program.
+    static test::ProgramResult Shell(const std::string& line) {
+        return test::run_program("/bin/sh", {"-c", line, QUIRNELCTL});
+    }
+    void Touch(const std::string& path) { std::ofstream(environment.volume() + "/" + path) << "sound"; }
+
+    test::TemporaryEnvironment environment;
+};
+
+TEST_F(Surroundings, SongsAreFoundThoughTheIndexWasDeleted) {
+    Touch("Oak - Leaf.mp3");
+    ASSERT_EQ(Shell("\"$0\" index").status, 0);
+    ASSERT_EQ(Shell("rm -r \"$XDG_DATA_HOME/bekits\"").status, 0);
+
+    EXPECT_EQ(Shell("\"$0\" find Leaf").output, environment.volume() + "/Oak - Leaf.mp3\n");
+    ASSERT_EQ(Shell("rm -r \"$XDG_DATA_HOME/bekits\"").status, 0);
+    EXPECT_EQ(Shell("\"$0\" query 'Audio:Songname==Leaf'").output,
+              environment.volume() + "/Oak - Leaf.mp3\n");
+}
+
+TEST_F(Surroundings, ResultsThatCannotBeWrittenAreAFailure) {
+    for (const char* command : {"volumes", "--help"}) {
+        const auto full = Shell("\"$0\" " + std::string(command) + " > /dev/full");
+        EXPECT_EQ(full.status, 1) << command;
+        EXPECT_EQ(full.errors, "quirnelctl: the results could not be written\n") << command;
+        const auto closed = Shell("\"$0\" " + std::string(command) + " >&-");
+        EXPECT_EQ(closed.status, 1) << command;
+        EXPECT_EQ(closed.errors, "quirnelctl: the results could not be written\n") << command;
+    }
+}
+
+TEST_F(Surroundings, ClosedDescriptorsHarmNeitherSongsNorIndex) {
+    Touch("Oak - Leaf.mp3");
+
+    EXPECT_EQ(Shell("\"$0\" --verbose index <&- >&- 2>&-").status, 1) << "its result could not be written";
+
+    EXPECT_EQ(test::read_file(environment.volume() + "/Oak - Leaf.mp3"), "sound");
+    EXPECT_EQ(Shell("\"$0\" find Leaf").output, environment.volume() + "/Oak - Leaf.mp3\n");
+}
+
+TEST_F(Surroundings, AJobUnderNohupSurvivesTheHangUp) {
+    for (int i = 0; i < 3000; ++i)
+        Touch("Oak - Leaf " + std::to_string(i) + ".mp3");
+    test::Program program("/bin/sh", {"-c", "trap '' HUP; exec \"$0\" index", QUIRNELCTL});
+    usleep(100'000);
+
+    program.signal(SIGHUP);
+
+    const auto result = program.wait();
+    EXPECT_EQ(result.status, 0) << result.errors;
+    EXPECT_EQ(result.output, "Indexed 3000 files on volume (" + environment.volume() + ")\n");
+}
+
+TEST_F(Surroundings, ASearchThatNoVolumeCanAnswerIsAFailure) {
+    Touch("Oak - Leaf.mp3");
+    ASSERT_EQ(Shell("\"$0\" index").status, 0);
+    environment.set("XDG_DATA_HOME", "/proc/nowhere");
+
+    for (const char* search : {"find Leaf", "query 'Audio:Songname==Leaf'"}) {
+        const auto result = Shell("\"$0\" " + std::string(search));
+        EXPECT_EQ(result.status, 1) << search;
+        EXPECT_EQ(result.errors, "quirnelctl: no volume here answers queries\n") << search;
+    }
+}
+
+TEST_F(Surroundings, AVolumeThatIsNamedTwiceIsIndexedOnce) {
+    Touch("Oak - Leaf.mp3");
+    const auto result = Shell("\"$0\" index '" + environment.volume() + "' '" + environment.volume() + "/.'");
+    EXPECT_EQ(result.output, "Indexed 1 files on volume (" + environment.volume() + ")\n");
+}
+
+} // namespace
