@@ -206,6 +206,26 @@ TEST(MessengerTest, ASendWaitsForRoomInAFullQueue) {
     EXPECT_EQ(seen.messages, 50);
 }
 
+TEST(MessengerTest, ASenderWhoWaitsForRoomHearsWhenTheLooperGoesAway) {
+    Seen seen;
+    BLooper* looper = new CountingLooper(seen, 1);
+    const BMessenger messenger(looper);
+    ASSERT_EQ(messenger.SendMessage('work'), B_OK);
+    std::atomic<bool> begun{false};
+    status_t status = B_OK;
+    std::thread sender([&] {
+        begun = true;
+        status = messenger.SendMessage('work');
+    });
+    while (!begun)
+        std::this_thread::yield();
+    // Most likely it waits then; if not, it hears the same.
+    snooze(20000);
+    looper->Quit();
+    sender.join();
+    EXPECT_EQ(status, B_BAD_PORT_ID);
+}
+
 TEST(MessengerTest, ARefusedMessageIsStillTheSenders) {
     Seen seen;
     BLooper* looper = new CountingLooper(seen, 1);
