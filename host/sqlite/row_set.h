@@ -16,6 +16,10 @@ class RowSet {
     explicit RowSet(std::size_t limit) : words_((limit + 63) / 64) {}
 
     void insert(RowNumber row) { words_[row / 64] |= std::uint64_t{1} << (row % 64); }
+    /// Without a branch: for conditions that nobody can foresee.
+    void insert_if(RowNumber row, bool wanted) {
+        words_[row / 64] |= std::uint64_t{wanted ? 1U : 0U} << (row % 64);
+    }
     void erase(RowNumber row) { words_[row / 64] &= ~(std::uint64_t{1} << (row % 64)); }
     bool holds(RowNumber row) const {
         return row / 64 < words_.size() && (words_[row / 64] >> (row % 64) & 1U) != 0;

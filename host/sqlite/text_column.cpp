@@ -224,13 +224,51 @@ inline void TextColumn::insert_rows(ValueNumber value, RowSet& rows) const {
     }
 }
 
-void TextColumn::find_containing(std::string_view needle, SearchKernel kernel, RowSet& rows) const {
-    ValueNumber last = 0;
-    search(kernel, arena_.data(), arena_.size(), needle, [&](std::size_t position) {
-        last = value_at(position, last);
-        insert_rows(last, rows);
-        return value_end(last);
+std::size_t TextColumn::find_in_bytes(ValueNumber first, ValueNumber last, std::string_view needle,
+                                      SearchKernel kernel, RowSet& rows) const {
+    const std::size_t start = starts_[first];
+    ValueNumber value = first;
+    std::size_t hits = 0;
+    search(kernel, arena_.data() + start, value_end(last - 1) - start, needle, [&](std::size_t position) {
+        value = value_at(start + position, value);
+        insert_rows(value, rows);
+        ++hits;
+        return value_end(value) - start;
     });
+    return hits;
+}
+
+std::size_t TextColumn::find_by_value(ValueNumber first, ValueNumber last, std::string_view needle,
+                                      RowSet& rows) const {
+    std::size_t hits = 0;
+#if defined(__x86_64__)
+    match_texts_avx2(arena_.data(), arena_.size(), starts_.data(), first, last, value_end(last - 1), needle,
+                     [&](std::size_t value, bool holds) {
+                         hits += holds ? 1 : 0;
+                         const std::uint32_t holder = rows_of_value_[value];
+                         if (holder < kNoRow)
+                             rows.insert_if(holder, holds);
+                         else if (holds)
+                             insert_rows(static_cast<ValueNumber>(value), rows);
+                     });
+#endif
+    return hits;
+}
+
+void TextColumn::find_containing(std::string_view needle, SearchKernel kernel, RowSet& rows) const {
+    // Few hits: one pass over the bytes, and the value is looked up for each hit. Many hits: value by value,
+    // which costs the same for a hit as for none. Neighbouring values tell which it will be.
+    constexpr ValueNumber kPart = 4096;
+    const auto values = static_cast<ValueNumber>(starts_.size());
+    bool many = false;
+    for (ValueNumber first = 0; first < values;) {
+        const ValueNumber last = first + std::min(kPart, values - first);
+        const std::size_t hits = many && kernel == SearchKernel::avx2
+                                     ? find_by_value(first, last, needle, rows)
+                                     : find_in_bytes(first, last, needle, kernel, rows);
+        many = hits > (last - first) / 4 * 3;
+        first = last;
+    }
 }
 
 void TextColumn::find(const Comparison& comparison, RowSet& rows) const {

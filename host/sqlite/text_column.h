@@ -62,6 +62,11 @@ class TextColumn {
     void detach(RowNumber row, ValueNumber value);
     void sweep(RowList& list, ValueNumber value);
     void insert_rows(ValueNumber value, RowSet& rows) const;
+    std::size_t find_in_bytes(ValueNumber first, ValueNumber last, std::string_view needle,
+                              SearchKernel kernel, RowSet& rows) const;
+    /// Only where the processor has AVX2.
+    std::size_t find_by_value(ValueNumber first, ValueNumber last, std::string_view needle,
+                              RowSet& rows) const;
     void compact();
 
     GrowingArray<char> arena_;

@@ -123,6 +123,57 @@ __attribute__((target("avx2"))) void search_avx2(const char* begin, std::size_t 
     }
     search_detail::search_bytes(begin, position, end, needle, on_hit);
 }
+
+/// Tells for each of the texts first..last-1, which lie end to end and end with a zero byte, whether it holds
+/// the needle: `on_text(number, holds)`. `starts` has the place of each text, `end_of_last` is that of the
+/// text before `last`. Nothing at or past `readable` is read.
+template <typename OnText>
+__attribute__((target("avx2"))) void
+match_texts_avx2(const char* begin, std::size_t readable, const std::uint32_t* starts, std::size_t first,
+                 std::size_t last, std::size_t end_of_last, std::string_view needle, OnText on_text) {
+    const __m256i head = _mm256_set1_epi8(needle.front());
+    const __m256i tail = _mm256_set1_epi8(needle.back());
+    const std::size_t distance = needle.size() - 1;
+    const auto equal_at = [begin](std::size_t at, __m256i wanted) __attribute__((target("avx2"))) {
+        const auto half = [&](std::size_t from) __attribute__((target("avx2"))) {
+            const __m256i bytes = _mm256_loadu_si256(reinterpret_cast<const __m256i*>(begin + from));
+            return static_cast<std::uint32_t>(_mm256_movemask_epi8(_mm256_cmpeq_epi8(bytes, wanted)));
+        };
+        return half(at) | std::uint64_t{half(at + 32)} << 32;
+    };
+    std::size_t at = starts[first];
+    for (std::size_t text = first; text < last; ++text) {
+        const std::size_t end = text + 1 < last ? starts[text + 1] : end_of_last;
+        bool holds = false;
+        _mm_prefetch(begin + at + kPrefetchDistance, _MM_HINT_T0);
+        while (!holds && at + distance < end) {
+            if (at + distance + 64 > readable) {
+                const auto note = [&](std::size_t) {
+                    holds = true;
+                    return end;
+                };
+                search_detail::search_bytes(begin, at, end, needle, note);
+                break;
+            }
+            std::uint64_t equal = equal_at(at, head);
+            if (distance != 0)
+                equal &= equal_at(at + distance, tail);
+            const std::size_t places = end - distance - at;
+            if (places < 64)
+                equal &= (std::uint64_t{1} << places) - 1;
+            if (distance > 1) {
+                while (equal != 0 &&
+                       !search_detail::middle_equals(
+                           begin + at + static_cast<std::size_t>(std::countr_zero(equal)), needle))
+                    equal &= equal - 1;
+            }
+            holds = equal != 0;
+            at += 64;
+        }
+        on_text(text, holds);
+        at = end;
+    }
+}
 #endif
 
 template <typename OnHit>
