@@ -82,11 +82,13 @@ class Indexes {
     virtual void entry_changed(const EntryRef& ref) = 0;
 
     /// Follows other programs' changes on all volumes from now on: watches directories and reconciles in the
-    /// background at idle priority. Called once by programs with a message loop; later calls do nothing.
+    /// background at idle priority; volumes that are mounted later are followed too. Called once by programs
+    /// with a message loop; later calls do nothing.
     virtual void follow_changes() = 0;
 
     /// Brings the index up to date with directories that changed since it last looked, and (thorough) with
-    /// every indexed file. Blocks. `cancelled` may be null.
+    /// every indexed file. After a process died with changes not yet written, either depth is thorough. Blocks.
+    /// `cancelled` may be null.
     enum class Depth { directories, thorough };
     virtual Status reconcile(DeviceId volume, Depth depth, const std::atomic<bool>* cancelled) = 0;
 
@@ -98,8 +100,8 @@ class Indexes {
     /// Returns when all changes reported so far are committed.
     virtual Status flush(DeviceId volume) = 0;
 
-    /// Commits, stops all threads and closes all databases; the next call opens them again. Called at the end
-    /// of a program.
+    /// Commits, stops following, ends all threads and closes all databases; the next call opens them again.
+    /// Called at the end of a program.
     virtual void shut_down() = 0;
 };
 

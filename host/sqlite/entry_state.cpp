@@ -2,6 +2,7 @@
 #include "host/linux/opening.h"
 #include "host/linux/system_calls.h"
 #include "host/sqlite/attribute_value.h"
+#include <algorithm>
 #include <cerrno>
 #include <ctime>
 #include <fcntl.h>
@@ -20,6 +21,37 @@ constexpr std::size_t kLongestComparedText = 65536;
 
 std::int64_t change_time_of(const struct stat& status) {
     return status.st_ctim.tv_sec * kSecond + status.st_ctim.tv_nsec;
+}
+
+RecordedAttribute recorded_form(const FileAttribute& attribute) {
+    RecordedAttribute recorded;
+    const AttributeValue::Kind kind = kind_of_type(attribute.type);
+    std::string_view bytes = attribute.bytes;
+    if (kind == AttributeValue::Kind::text)
+        bytes = bytes.substr(0, bytes.find('\0'));
+    recorded.cut =
+        !attribute.complete || kind == AttributeValue::Kind::none || bytes.size() > kLongestRecordedValue;
+    if (!recorded.cut)
+        recorded.bytes = std::as_bytes(std::span(bytes));
+    return recorded;
+}
+
+bool row_agrees(const IndexRow& row, const EntryState& state, const AttributeNames& names) {
+    if (row.inode != state.status.st_ino || row.change_time != change_time_of(state.status))
+        return false;
+    RecordReader reader(row.attributes);
+    RecordedAttribute recorded;
+    for (const FileAttribute& attribute : state.attributes) {
+        if (!reader.next(recorded))
+            return false;
+        const auto name = names.find(recorded.id);
+        const RecordedAttribute wanted = recorded_form(attribute);
+        if (name == names.end() || name->second.name != attribute.name ||
+            name->second.type != attribute.type || recorded.cut != wanted.cut ||
+            !std::ranges::equal(recorded.bytes, wanted.bytes))
+            return false;
+    }
+    return !reader.next(recorded);
 }
 
 Status StateReader::read(int directory, DeviceId device, const char* leaf, EntryState& state) {

@@ -35,6 +35,12 @@ struct EntryState {
 
 std::int64_t change_time_of(const struct stat& status);
 
+/// The form in which a row keeps this attribute; its number is left to the caller. Borrows from `attribute`.
+RecordedAttribute recorded_form(const FileAttribute& attribute);
+
+/// The row is, apart from its place, what would be written for this state.
+bool row_agrees(const IndexRow& row, const EntryState& state, const AttributeNames& names);
+
 /// Reads the states of entries. One thread at a time.
 class StateReader {
   public:

@@ -1,8 +1,10 @@
 #include "host/sqlite/index_query.h"
 #include "host/linux/system_calls.h"
 #include "host/linux/volume_table.h"
+#include <algorithm>
 #include <cerrno>
 #include <fcntl.h>
+#include <functional>
 
 namespace host {
 namespace {
@@ -43,6 +45,8 @@ const Directory* IndexQuery::directory_of(std::uint64_t inode) {
         }
         if (!handle)
             handle = cache.find(index_->device(), inode, DirectoryCache::Search::whole_volume);
+        if (!handle)
+            volume_is_gone_ = VolumeTable::instance().refresh()->find(index_->device()) == nullptr;
         found = directories_.emplace(inode, handle ? *handle : nullptr).first;
     }
     last_inode_ = inode;
@@ -54,7 +58,8 @@ bool IndexQuery::is_hit(IndexRow& row, Hit& hit) {
     struct stat status = {};
     if (directory == nullptr || system_calls().fstatat(directory->descriptor(), row.name.c_str(), &status,
                                                        AT_SYMLINK_NOFOLLOW) != 0) {
-        index_->entry_observed(row.directory, row.name, ChangeNote::Source::observed);
+        if (!volume_is_gone_)
+            index_->entry_observed(row.directory, row.name, ChangeNote::Source::observed);
         return false;
     }
     const bool true_row =
@@ -71,26 +76,70 @@ bool IndexQuery::is_hit(IndexRow& row, Hit& hit) {
     hit.ref.directory = row.directory;
     hit.ref.leaf = row.name;
     hit.inode = status.st_ino;
+    return give(hit);
+}
+
+bool IndexQuery::give(const Hit& hit) {
+    std::uint64_t fingerprint = std::hash<std::string>()(hit.ref.leaf) + hit.ref.directory;
+    fingerprint = (fingerprint ^ fingerprint >> 32) * 0x9e3779b97f4a7c15U + hit.ref.directory;
+    const auto sorted_end = given_.begin() + static_cast<std::ptrdiff_t>(given_before_);
+    if (std::binary_search(given_.begin(), sorted_end, fingerprint))
+        return false;
+    given_.push_back(fingerprint);
     return !live_ || live_->hand_out(hit.ref, hit.inode);
 }
 
-Status IndexQuery::next(Hit& hit) {
-    if (position_ == rows_.size())
-        return ENOENT;
-    if (!reader_) {
-        reader_ = index_->borrow_reader();
-        if (!reader_ || !succeeded(reader_->attributes(names_)))
-            return ENOENT;
+Status IndexQuery::next_row(Hit& hit) {
+    if (walk_) {
+        Status status;
+        while ((status = walk_->next(hit)).ok() && !give(hit)) {
+        }
+        return status;
     }
-    while (position_ < rows_.size()) {
-        const DatabaseResult result = reader_->read(rows_[position_++], row_);
-        if (result == DatabaseResult::row && is_hit(row_, hit))
-            return {};
-        if (result == DatabaseResult::damaged)
-            index_->report_damage();
+    DatabaseResult result = DatabaseResult::done;
+    if (!reader_ && position_ < rows_.size()) {
+        reader_ = index_->borrow_reader();
+        result = reader_ ? reader_->attributes(names_) : DatabaseResult::failed;
+    }
+    while (succeeded(result) && position_ < rows_.size() && !volume_is_gone_) {
+        result = reader_->read(rows_[position_], row_);
         if (!succeeded(result))
             break;
+        ++position_;
+        if (result == DatabaseResult::row && is_hit(row_, hit))
+            return {};
     }
+    return succeeded(result) ? Status(ENOENT) : recover(result);
+}
+
+Status IndexQuery::recover(DatabaseResult result) {
+    reader_.reset();
+    std::sort(given_.begin(), given_.end());
+    given_before_ = given_.size();
+    // Damage that comes again right after the index was rebuilt is not worth a third attempt.
+    const bool again = recovered_;
+    recovered_ = true;
+    position_ = 0;
+    rows_.clear();
+    Status found = ENOTSUP;
+    if (result == DatabaseResult::damaged && !again) {
+        index_->report_damage();
+        found = index_->search(*condition_, rows_);
+    }
+    if (found.error() == ENOTSUP) {
+        walk_ = std::make_unique<WalkQuery>(index_->device(), condition_, nullptr, nullptr, nullptr);
+        found = walk_->rewind();
+    }
+    return found.ok() ? Status(EAGAIN) : found;
+}
+
+Status IndexQuery::next(Hit& hit) {
+    Status status;
+    do {
+        status = next_row(hit);
+    } while (status.error() == EAGAIN);
+    if (status.error() != ENOENT)
+        return status;
     position_ = rows_.size();
     directories_.clear();
     last_directory_ = nullptr;
@@ -100,13 +149,22 @@ Status IndexQuery::next(Hit& hit) {
 }
 
 Status IndexQuery::rewind() {
-    const Status found = index_->search(*condition_, rows_);
+    walk_.reset();
+    given_.clear();
+    given_before_ = 0;
+    recovered_ = false;
+    volume_is_gone_ = false;
+    directories_.clear();
+    last_directory_ = nullptr;
+    rows_.clear();
     position_ = 0;
-    if (reader_ && !succeeded(reader_->attributes(names_)))
-        reader_.reset();
     if (live_)
         live_->rewind();
-    return found;
+    reader_.reset();
+    Status found = index_->search(*condition_, rows_);
+    if (found.error() == ENOTSUP)
+        found = recover(DatabaseResult::failed);
+    return found.error() == EAGAIN ? Status() : found;
 }
 
 } // namespace host

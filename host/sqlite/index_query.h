@@ -6,6 +6,7 @@
 #include "host/sqlite/entry_state.h"
 #include "host/sqlite/live_queries.h"
 #include "host/sqlite/volume_index.h"
+#include "host/sqlite/walk_query.h"
 #include <memory>
 #include <unordered_map>
 #include <vector>
@@ -23,6 +24,11 @@ class IndexQuery final : public RunningQuery {
     Status rewind() override;
 
   private:
+    Status next_row(Hit& hit);
+    /// The database cannot be read any further: goes on from a rebuilt index, or by a walk, without the hits
+    /// that were given. EAGAIN: ask next_row() again.
+    Status recover(DatabaseResult result);
+    bool give(const Hit& hit);
     bool is_hit(IndexRow& row, Hit& hit);
     const Directory* directory_of(std::uint64_t inode);
 
@@ -36,8 +42,15 @@ class IndexQuery final : public RunningQuery {
     IndexRow row_;
     /// The directories of recent hits; null: not to be found.
     std::unordered_map<std::uint64_t, DirectoryCache::Handle> directories_;
+    bool volume_is_gone_ = false;
     std::uint64_t last_inode_ = 0;
     const Directory* last_directory_ = nullptr;
+    /// Fingerprints of the hits that were given.
+    std::vector<std::uint64_t> given_;
+    /// So many of them, sorted, were given before the database was given up; they are not given again.
+    std::size_t given_before_ = 0;
+    bool recovered_ = false;
+    std::unique_ptr<WalkQuery> walk_;
 };
 
 } // namespace host

@@ -1,4 +1,5 @@
 #include "host/sqlite/row_writer.h"
+#include "host/linux/volume_table.h"
 #include <algorithm>
 #include <cerrno>
 #include <fcntl.h>
@@ -53,6 +54,10 @@ DatabaseResult RowWriter::write(std::vector<ChangeNote>& notes, const std::set<s
         result = store_.attributes(names_);
     for (std::size_t i = 0; succeeded(result) && i < notes.size(); ++i)
         result = write_note(notes[i], indexed, listeners);
+    const bool erases = std::any_of(changes_.begin(), changes_.end(), [](const auto& c) { return c.erased; });
+    // What a volume that went away does not show has not vanished from it.
+    if (succeeded(result) && erases && VolumeTable::instance().refresh()->find(device_) == nullptr)
+        result = DatabaseResult::failed;
     if (succeeded(result) && !changes_.empty()) {
         std::vector<RowNumber> rows;
         rows.reserve(changes_.size());
@@ -89,16 +94,8 @@ DatabaseResult RowWriter::make_record(const EntryState& state, std::vector<std::
             found = attribute_ids_.emplace(std::make_pair(attribute.name, attribute.type), id).first;
             names_[id] = {attribute.name, attribute.type};
         }
-        RecordedAttribute recorded;
+        RecordedAttribute recorded = recorded_form(attribute);
         recorded.id = found->second;
-        const AttributeValue::Kind kind = kind_of_type(attribute.type);
-        std::string_view bytes = attribute.bytes;
-        if (kind == AttributeValue::Kind::text)
-            bytes = bytes.substr(0, bytes.find('\0'));
-        recorded.cut =
-            !attribute.complete || kind == AttributeValue::Kind::none || bytes.size() > kLongestRecordedValue;
-        if (!recorded.cut)
-            recorded.bytes = std::as_bytes(std::span(bytes));
         append_recorded_attribute(record, recorded);
     }
     return DatabaseResult::done;

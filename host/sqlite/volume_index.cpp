@@ -49,7 +49,8 @@ VolumeIndex::~VolumeIndex() {
         readers_.clear();
     }
     MutexLock lock(mutex_);
-    if (store_.is_open() && dirty_ && !lost_changes_ && !found_unclean_ && !slots_.others_alive())
+    if (store_.is_open() && dirty_ && !lost_changes_ && !found_unclean_ && !is_suspect_locked() &&
+        !slots_.others_alive())
         (void)store_.set_meta("clean", 1);
     store_.close();
     queue_.show_in(nullptr);
@@ -94,10 +95,10 @@ bool VolumeIndex::open_locked(Opening opening) {
         return false;
     if (slots_.open(files_.slots()))
         queue_.show_in(slots_.own());
-    if (slots_.take_over_dead() || (found_unclean_ && !slots_.others_alive())) {
-        found_unclean_ = true;
+    if (slots_.take_over_dead() || (found_unclean_ && !slots_.others_alive()))
+        mark_suspect_locked();
+    if (is_suspect_locked())
         reconcile_in_background();
-    }
     if (!writer_thread_.joinable() && !stopping_)
         writer_thread_ = std::thread([this] { write_groups(); });
     open_ = true;
@@ -133,6 +134,25 @@ void VolumeIndex::mark_incomplete_locked() {
     lost_changes_ = true;
     ++losses_;
     (void)store_.set_meta("complete", 0);
+}
+
+void VolumeIndex::mark_suspect_locked() {
+    found_unclean_ = true;
+    // A mark of its own each time: a walk takes away only the one that it began with.
+    if (!succeeded(store_.set_meta("suspect", now())))
+        mark_incomplete_locked();
+}
+
+bool VolumeIndex::is_suspect_locked() {
+    return store_.meta("suspect", 0) != 0;
+}
+
+bool VolumeIndex::take_over_dead() {
+    if (!slots_.take_over_dead())
+        return false;
+    MutexLock lock(mutex_);
+    mark_suspect_locked();
+    return true;
 }
 
 Status VolumeIndex::create(const std::string& attribute, std::uint32_t type) {
@@ -242,9 +262,14 @@ void VolumeIndex::write_groups() {
     std::vector<ChangeNote> group;
     std::uint64_t position = 0;
     while (queue_.take(group, position)) {
-        const bool written = write_group(group);
+        bool written = write_group(group);
+        if (queue_.overflowed()) {
+            MutexLock lock(mutex_);
+            mark_incomplete_locked();
+            written = false;
+        }
         queue_.set_committed(position);
-        if (!written || queue_.overflowed())
+        if (!written)
             run_background();
     }
 }
@@ -288,7 +313,7 @@ Status VolumeIndex::search(const Condition& condition, std::vector<RowNumber>& r
         return {};
     (void)flush();
     slots_.wait_for_others();
-    if (slots_.take_over_dead())
+    if (take_over_dead())
         reconcile_in_background();
     for (int attempt = 0; attempt < 3; ++attempt) {
         {
@@ -364,8 +389,10 @@ void VolumeIndex::run_background() {
         (void)set_thread_schedule(current_native_thread(), {process_niceness() + 10, io_class::idle});
         Status status;
         do {
-            reconcile_wanted_ = false;
-            status = walk_volume(Looking::changed_only, &stopping_, nullptr);
+            // Somebody who could not wait may have walked already.
+            if (!reconcile_wanted_.exchange(false) && is_complete())
+                break;
+            status = walk_volume(Looking::changed_only, nullptr, nullptr, Ground::back);
             // The database could not be written: a full disk has time to be seen to.
             for (int i = 0; status.error() == ENOTSUP && i < kRetrySteps && !stopping_; ++i)
                 std::this_thread::sleep_for(kRetryStep);

@@ -66,6 +66,13 @@ class VolumeIndex {
   private:
     enum class Opening { only_existing, create };
     enum class Looking { changed_only, everything };
+    /// A walk in the background gives way to one that somebody waits for.
+    enum class Ground { fore, back };
+    /// An entry whose row is to be written when a walk has been gone through to its end.
+    struct Finding {
+        std::uint64_t directory = 0;
+        std::string leaf;
+    };
 
     bool open_locked(Opening opening) REQUIRES(mutex_);
     bool open_store_locked() REQUIRES(mutex_);
@@ -75,8 +82,18 @@ class VolumeIndex {
     bool write_group(std::vector<ChangeNote>& group);
     void mark_incomplete_locked() REQUIRES(mutex_);
     bool is_complete();
+    /// A process died that may have had changes left to write: rows are checked before they are relied upon.
+    void mark_suspect_locked() REQUIRES(mutex_);
+    bool is_suspect_locked() REQUIRES(mutex_);
+    /// True when a process was found dead just now; the index is suspect from then on.
+    bool take_over_dead();
     Status walk_volume(Looking looking, const std::atomic<bool>* cancelled,
-                       const std::function<bool(std::uint64_t)>& progress);
+                       const std::function<bool(std::uint64_t)>& progress, Ground ground = Ground::fore);
+    Status walk_locked(Looking looking, const std::atomic<bool>* cancelled,
+                       const std::function<bool(std::uint64_t)>& progress, Ground ground)
+        REQUIRES(walk_mutex_);
+    Status finish_walk(const std::vector<IndexStore::KnownDirectory>& directories, std::int64_t started,
+                       std::int64_t suspect, std::uint64_t losses, std::size_t indices);
     Status look_at_directories(const std::atomic<bool>* cancelled);
     void note_directory(IndexStore& reader, std::uint64_t directory, const Directory& opened,
                         std::vector<std::uint64_t>* subdirectories);
@@ -113,6 +130,8 @@ class VolumeIndex {
 
     /// One walk at a time.
     Mutex walk_mutex_;
+    std::atomic<int> walks_waiting_{0};
+    std::atomic<bool> gave_way_{false};
     Mutex background_mutex_;
     std::thread background_ GUARDED_BY(background_mutex_);
     std::atomic<bool> background_runs_{false};

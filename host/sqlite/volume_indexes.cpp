@@ -144,6 +144,7 @@ Status VolumeIndexes::flush(DeviceId device) {
 
 void VolumeIndexes::shut_down() {
     std::map<DeviceId, std::shared_ptr<VolumeIndex>> closing;
+    following_ = false;
     MutexLock lock(mutex_);
     closing.swap(indexes_);
     lock.unlock();

@@ -5,6 +5,7 @@
 #include "host/linux/system_calls.h"
 #include "host/linux/tree_walker.h"
 #include "host/sqlite/volume_index.h"
+#include <algorithm>
 #include <cerrno>
 #include <chrono>
 #include <dirent.h>
@@ -27,26 +28,49 @@ std::int64_t now() {
 } // namespace
 
 Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancelled,
-                                const std::function<bool(std::uint64_t)>& progress) {
+                                const std::function<bool(std::uint64_t)>& progress, Ground ground) {
+    if (ground == Ground::fore)
+        ++walks_waiting_;
     MutexLock walking(walk_mutex_);
+    if (ground == Ground::fore)
+        --walks_waiting_;
+    const Status status = walk_locked(looking, cancelled, progress, ground);
+    walking.unlock();
+    if (ground == Ground::back)
+        gave_way_ = status.error() == ECANCELED;
+    else if (gave_way_.exchange(false) && !status.ok())
+        reconcile_in_background();
+    return status;
+}
+
+Status VolumeIndex::walk_locked(Looking looking, const std::atomic<bool>* cancelled,
+                                const std::function<bool(std::uint64_t)>& progress, Ground ground) {
     const std::int64_t started = now();
     std::size_t indices = 0;
     std::uint64_t losses = 0;
     std::int64_t walked = 0;
+    std::int64_t suspect = 0;
+    std::set<std::string> indexed;
+    bool complete = false;
     {
         MutexLock lock(mutex_);
         if (!open_locked(Opening::only_existing))
             return {};
-        const bool complete = !lost_changes_ && store_.meta("complete", 0) != 0;
+        complete = !lost_changes_ && store_.meta("complete", 0) != 0;
         // Somebody else's walk was waited for.
-        if (complete && looking == Looking::changed_only && cancelled == nullptr && !progress)
+        if (complete && looking == Looking::changed_only && ground == Ground::fore && cancelled == nullptr &&
+            !progress)
             return {};
-        if (!complete)
-            looking = Looking::everything;
         indices = list_.size();
+        indexed = indexed_;
         walked = store_.meta("walked", 0);
+        suspect = store_.meta("suspect", 0);
         losses = losses_;
     }
+    // Rows that are complete stand until the last file has been looked at.
+    const bool keeps_rows = complete && looking == Looking::everything;
+    if (!complete)
+        looking = Looking::everything;
     auto opened = TreeWalker::open(device_);
     if (!opened)
         return opened.status();
@@ -55,8 +79,8 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
     if (!reader)
         return ENOTSUP;
     // A row's number may be given to another file meanwhile, so rows are told apart by where they stand.
-    RowSet seen(static_cast<std::size_t>(reader->largest_row()) + 1);
     const RowNumber largest = reader->largest_row();
+    RowSet seen(static_cast<std::size_t>(largest) + 1);
     std::vector<IndexStore::KnownDirectory> directories;
     std::unordered_set<std::uint64_t> known;
     {
@@ -68,13 +92,20 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
                 known.insert(directory.inode);
         }
     }
+    AttributeNames names;
+    if (keeps_rows && !succeeded(reader->attributes(names)))
+        return ENOTSUP;
+    StateReader states;
+    EntryState state;
+    std::vector<Finding> findings;
     directories.push_back({walker.root_status().st_ino, walker.root_status().st_ino, ".",
                            change_time_of(walker.root_status())});
     TreeWalker::Entry entry;
     std::uint64_t count = 0;
     Status status;
     while ((status = walker.next(entry)).ok()) {
-        if (stopping_ || (cancelled != nullptr && cancelled->load(std::memory_order_relaxed)))
+        if (stopping_ || (cancelled != nullptr && cancelled->load(std::memory_order_relaxed)) ||
+            (ground == Ground::back && walks_waiting_ != 0))
             return ECANCELED;
         if (progress && ++count % kProgressStep == 0 && !progress(count))
             return ECANCELED;
@@ -85,11 +116,25 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
             continue;
         IndexRow row;
         const std::string leaf(entry.leaf);
-        const DatabaseResult found = reader->find_place(entry.directory, leaf, row);
+        const DatabaseResult found = keeps_rows ? reader->find(entry.directory, leaf, row)
+                                                : reader->find_place(entry.directory, leaf, row);
         if (!succeeded(found))
             return ENOTSUP;
         if (found == DatabaseResult::row && row.id <= largest)
             seen.insert(row.id);
+        if (keeps_rows) {
+            if (!states.read(entry.directory_descriptor, device_, leaf.c_str(), state).ok())
+                continue;
+            const bool wanted = std::any_of(state.attributes.begin(), state.attributes.end(),
+                                            [&](const auto& a) { return indexed.contains(a.name); });
+            const bool agrees =
+                found == DatabaseResult::row ? wanted && row_agrees(row, state, names) : !wanted;
+            if (!agrees) {
+                walker.remember_directory();
+                findings.push_back({entry.directory, leaf});
+            }
+            continue;
+        }
         bool changed = looking == Looking::everything;
         if (!changed) {
             struct stat found_status = {};
@@ -108,6 +153,12 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
     }
     if (status.error() != ENOENT)
         return status;
+    // What a volume that went away does not show has not vanished from it.
+    if (VolumeTable::instance().refresh()->find(device_) == nullptr)
+        return ENODEV;
+    // Not "observed": these rows may be wrong although their change times are right.
+    for (const Finding& finding : findings)
+        queue_.put(finding.directory, finding.leaf, ChangeNote::Source::own);
     for (RowNumber id = 1; id <= largest; ++id) {
         IndexRow row;
         if (!seen.holds(id) && reader->read(id, row) == DatabaseResult::row)
@@ -115,6 +166,15 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
     }
     give_back_reader(std::move(reader));
     queue_.wait_for(queue_.reported());
+    const Status finished = finish_walk(directories, started, suspect, losses, indices);
+    if (finished.ok() && progress)
+        (void)progress(count);
+    return finished;
+}
+
+Status VolumeIndex::finish_walk(const std::vector<IndexStore::KnownDirectory>& directories,
+                                std::int64_t started, std::int64_t suspect, std::uint64_t losses,
+                                std::size_t indices) {
     MutexLock lock(mutex_);
     if (losses_ != losses || !store_.is_open())
         return ENOTSUP;
@@ -129,6 +189,8 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
         result = store_.set_meta("complete", 1);
     if (succeeded(result))
         result = store_.set_meta("walked", started);
+    if (succeeded(result) && store_.meta("suspect", 0) == suspect)
+        result = store_.set_meta("suspect", 0);
     if (succeeded(result))
         result = store_.commit();
     if (!succeeded(result)) {
@@ -138,8 +200,6 @@ Status VolumeIndex::walk_volume(Looking looking, const std::atomic<bool>* cancel
     }
     found_unclean_ = false;
     lost_changes_ = false;
-    if (progress)
-        (void)progress(count);
     return {};
 }
 
@@ -246,13 +306,17 @@ Status VolumeIndex::reconcile(Indexes::Depth depth, const std::atomic<bool>* can
     if (!in_use())
         return {};
     (void)flush();
+    (void)take_over_dead();
     static const std::atomic<bool> never{false};
     const std::atomic<bool>* flag = cancelled != nullptr ? cancelled : &never;
-    Status status;
-    if (depth == Indexes::Depth::directories && is_complete())
-        status = look_at_directories(flag);
-    else
-        status = walk_volume(Looking::changed_only, flag, nullptr);
+    bool directories_suffice = depth == Indexes::Depth::directories && is_complete();
+    if (directories_suffice) {
+        MutexLock lock(mutex_);
+        // Changes of attributes that were lost with a process are not to be seen from the directories.
+        directories_suffice = !is_suspect_locked();
+    }
+    const Status status =
+        directories_suffice ? look_at_directories(flag) : walk_volume(Looking::changed_only, flag, nullptr);
     return status.error() == EAGAIN || status.error() == ENOTSUP ? Status() : status;
 }
 
