@@ -252,8 +252,10 @@ status_t BQuery::GetNextEntry(BEntry* entry, bool traverse) {
         return B_BAD_VALUE;
     entry_ref ref;
     status_t status = GetNextRef(&ref);
-    if (status == B_OK)
-        return entry->SetTo(&ref, traverse);
+    for (; status == B_OK; status = GetNextRef(&ref)) {
+        if (entry->SetTo(&ref, traverse) == B_OK)
+            return B_OK;
+    }
     entry->Unset();
     return status;
 }

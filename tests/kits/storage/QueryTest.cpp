@@ -16,6 +16,7 @@
 #include "StorageTest.h"
 
 #include <errno.h>
+#include <filesystem>
 #include <math.h>
 #include <mutex>
 #include <set>
@@ -227,6 +228,34 @@ TEST_F(Query, RewindStartsAgainAndRecordsAreFilled) {
     EXPECT_EQ(query.GetNextEntry(&entry), B_ENTRY_NOT_FOUND);
     EXPECT_EQ(query.GetNextRef(nullptr), B_BAD_VALUE);
     EXPECT_EQ(query.GetNextEntry(nullptr), B_BAD_VALUE);
+}
+
+TEST_F(Query, AnEntryWhoseDirectoryHasGoneDoesNotEndTheWalk) {
+    MakeDirectory("a");
+    MakeDirectory("b");
+    MakeTagged("a/one", "same");
+    MakeTagged("b/two", "same");
+    BQuery query;
+    query.SetPredicate("Test:Title==same");
+    BVolume volume(Device());
+    ASSERT_EQ(query.SetVolume(&volume), B_OK);
+    ASSERT_EQ(query.Fetch(), B_OK);
+    entry_ref first;
+    ASSERT_EQ(query.GetNextRef(&first), B_OK);
+    ASSERT_EQ(query.Rewind(), B_OK);
+    // Too little room: the first one is found, and waits to be handed out.
+    struct dirent record;
+    ASSERT_EQ(query.GetNextDirents(&record, 1), B_BAD_VALUE);
+    const std::string gone = first.name;
+    std::filesystem::remove_all(At(gone == "one" ? "a" : "b"));
+
+    BEntry entry;
+    ASSERT_EQ(query.GetNextEntry(&entry), B_OK);
+
+    char name[B_FILE_NAME_LENGTH];
+    ASSERT_EQ(entry.GetName(name), B_OK);
+    EXPECT_STREQ(name, gone == "one" ? "two" : "one");
+    EXPECT_EQ(query.GetNextEntry(&entry), B_ENTRY_NOT_FOUND);
 }
 
 namespace {
