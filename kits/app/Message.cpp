@@ -245,7 +245,7 @@ status_t BMessage::Unflatten(BDataIO* stream) {
     if (status == B_OK)
         status = read_message_header(form.data(), &totalSize);
     // Piece by piece: the header may promise far more than the stream holds.
-    constexpr size_t kPiece = 64 * 1024;
+    constexpr size_t kPiece = size_t{64} * 1024;
     while (status == B_OK && form.size() < totalSize) {
         const size_t have = form.size();
         form.resize(have + std::min(kPiece, totalSize - have));
