@@ -74,7 +74,7 @@ TEST_F(InvokerTest, AnInvocationSendsACopyOfTheKeptMessageWithTheTime) {
     EXPECT_FALSE(message->HasInt64("when"));
 }
 
-TEST_F(InvokerTest, AnotherMessageMaySentInPlaceOfTheKeptOne) {
+TEST_F(InvokerTest, AnotherMessageMayBeSentInPlaceOfTheKeptOne) {
     BInvoker invoker(new BMessage('kept'), BMessenger(&mHandler));
     BMessage other('othr');
     other.AddInt64("when", 1);
