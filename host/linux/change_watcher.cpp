@@ -22,14 +22,14 @@ namespace {
 
 constexpr std::uint32_t kEvents = IN_ATTRIB | IN_CLOSE_WRITE | IN_CREATE | IN_DELETE | IN_MOVED_FROM |
                                   IN_MOVED_TO | IN_ONLYDIR | IN_EXCL_UNLINK;
-constexpr int kPollMilliseconds = 600'000;
 constexpr int kDeepest = 200;
 
 } // namespace
 
-ChangeWatcher::ChangeWatcher(DeviceId device, Sink sink)
-    : device_(device), sink_(std::move(sink)), notifications_(inotify_init1(IN_NONBLOCK | IN_CLOEXEC)),
-      wake_(eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK)), thread_([this] { run(); }) {}
+ChangeWatcher::ChangeWatcher(DeviceId device, Sink sink, const Limits& limits)
+    : device_(device), sink_(std::move(sink)), limits_(limits),
+      notifications_(inotify_init1(IN_NONBLOCK | IN_CLOEXEC)), wake_(eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK)),
+      thread_([this] { run(); }) {}
 
 ChangeWatcher::~ChangeWatcher() {
     stopping_ = true;
@@ -50,6 +50,10 @@ void ChangeWatcher::say_limit_once() {
 void ChangeWatcher::watch(int directory, std::uint64_t inode) {
     if (limited_)
         return;
+    if (directories_.size() >= limits_.directories) {
+        say_limit_once();
+        return;
+    }
     const std::string path = "/proc/self/fd/" + std::to_string(directory);
     const int number = inotify_add_watch(notifications_.get(), path.c_str(), kEvents);
     if (number >= 0)
@@ -90,7 +94,8 @@ void ChangeWatcher::run() {
     add_all();
     while (!stopping_) {
         pollfd waited[2] = {{wake_.get(), POLLIN, 0}, {notifications_.get(), POLLIN, 0}};
-        const int ready = poll(waited, notifications_.valid() ? 2 : 1, kPollMilliseconds);
+        const int ready =
+            poll(waited, notifications_.valid() ? 2 : 1, static_cast<int>(limits_.interval.count()));
         if (stopping_)
             return;
         if (ready == 0 && limited_)

@@ -3,8 +3,11 @@
 #include "host/api/entry.h"
 #include "host/linux/descriptor.h"
 #include <atomic>
+#include <chrono>
+#include <cstddef>
 #include <cstdint>
 #include <functional>
+#include <limits>
 #include <string>
 #include <thread>
 #include <unordered_map>
@@ -24,7 +27,15 @@ class ChangeWatcher {
         std::function<void()> changes_missed;
     };
 
-    ChangeWatcher(DeviceId device, Sink sink);
+    struct Limits {
+        /// As many directories are watched, and no more than the system allows.
+        std::size_t directories = std::numeric_limits<std::size_t>::max();
+        /// How often changes may have been missed while not all directories are watched.
+        std::chrono::milliseconds interval = std::chrono::minutes(10);
+    };
+
+    ChangeWatcher(DeviceId device, Sink sink) : ChangeWatcher(device, std::move(sink), Limits()) {}
+    ChangeWatcher(DeviceId device, Sink sink, const Limits& limits);
     /// Waits for the thread.
     ~ChangeWatcher();
     ChangeWatcher(const ChangeWatcher&) = delete;
@@ -44,6 +55,7 @@ class ChangeWatcher {
 
     const DeviceId device_;
     const Sink sink_;
+    const Limits limits_;
     Descriptor notifications_;
     Descriptor wake_;
     std::atomic<bool> stopping_{false};

@@ -11,7 +11,6 @@ VolumeIndexes::~VolumeIndexes() {
 }
 
 std::shared_ptr<VolumeIndex> VolumeIndexes::of(DeviceId device) {
-    std::shared_ptr<VolumeIndex> gone;
     MutexLock lock(mutex_);
     const auto found = indexes_.find(device);
     if (found != indexes_.end())
@@ -73,12 +72,7 @@ VolumeIndexes::query(DeviceId device, std::shared_ptr<const Predicate> predicate
     if (!condition)
         return Status(EINVAL);
     if (VolumeTable::instance().refresh()->find(device) == nullptr) {
-        std::shared_ptr<VolumeIndex> gone;
-        MutexLock lock(mutex_);
-        if (const auto found = indexes_.find(device); found != indexes_.end()) {
-            gone = std::move(found->second);
-            indexes_.erase(found);
-        }
+        volume_went(device);
         return Status(ENODEV);
     }
     const auto index = of(device);
@@ -120,11 +114,32 @@ void VolumeIndexes::entry_changed(const EntryRef& ref) {
 }
 
 void VolumeIndexes::follow_changes() {
-    following_ = true;
-    for (const DeviceId device : VolumeTable::instance().list()) {
-        if (const auto index = of(device); index && index->in_use())
-            index->follow();
+    {
+        MutexLock lock(mutex_);
+        if (following_.exchange(true))
+            return;
+        mounts_ = std::make_unique<MountFollower>([this](Volumes::Change change, DeviceId device) {
+            change == Volumes::Change::mounted ? volume_came(device) : volume_went(device);
+        });
     }
+    for (const DeviceId device : VolumeTable::instance().list())
+        volume_came(device);
+}
+
+void VolumeIndexes::volume_came(DeviceId device) {
+    if (const auto index = of(device); index && index->in_use())
+        index->follow();
+}
+
+void VolumeIndexes::volume_went(DeviceId device) {
+    std::shared_ptr<VolumeIndex> gone;
+    MutexLock lock(mutex_);
+    if (const auto found = indexes_.find(device); found != indexes_.end()) {
+        gone = std::move(found->second);
+        indexes_.erase(found);
+    }
+    // Its end waits for its threads.
+    lock.unlock();
 }
 
 Status VolumeIndexes::reconcile(DeviceId device, Depth depth, const std::atomic<bool>* cancelled) {
@@ -144,8 +159,13 @@ Status VolumeIndexes::flush(DeviceId device) {
 
 void VolumeIndexes::shut_down() {
     std::map<DeviceId, std::shared_ptr<VolumeIndex>> closing;
-    following_ = false;
+    std::unique_ptr<MountFollower> mounts;
     MutexLock lock(mutex_);
+    following_ = false;
+    mounts = std::move(mounts_);
+    lock.unlock();
+    mounts.reset();
+    lock.lock();
     closing.swap(indexes_);
     lock.unlock();
 }

@@ -2,6 +2,7 @@
 
 #include "host/api/index.h"
 #include "host/api/thread_safety.h"
+#include "host/sqlite/mount_follower.h"
 #include "host/sqlite/volume_index.h"
 #include <atomic>
 #include <map>
@@ -32,9 +33,13 @@ class VolumeIndexes final : public Indexes {
     std::shared_ptr<VolumeIndex> of(DeviceId volume);
 
   private:
+    void volume_came(DeviceId volume);
+    void volume_went(DeviceId volume);
+
     std::atomic<bool> following_{false};
     Mutex mutex_;
     std::map<DeviceId, std::shared_ptr<VolumeIndex>> indexes_ GUARDED_BY(mutex_);
+    std::unique_ptr<MountFollower> mounts_ GUARDED_BY(mutex_);
 };
 
 } // namespace host

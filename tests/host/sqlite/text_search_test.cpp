@@ -102,6 +102,31 @@ TEST(TextColumn, AgreesWithAMapUnderRandomChanges) {
     }
 }
 
+TEST(TextColumn, ManyHitsAreFoundValueByValue) {
+    std::mt19937_64 random(RandomSeed());
+    TextColumn column;
+    constexpr RowNumber rows = 30000;
+    std::vector<std::string> model;
+    for (RowNumber row = 0; row < rows; ++row) {
+        // The middle third has few hits, so that the search changes its way back and forth.
+        const int letters = row / 10000 == 1 ? 20 : 2;
+        model.push_back(row % 7 == 6 ? model[row - 5] : random_text(random, random() % 150, letters));
+        column.set(row, model.back());
+    }
+    for (const std::string needle : {"a", "ab", "aab", "babab", "abbabaab"}) {
+        std::vector<RowNumber> expected;
+        for (RowNumber row = 0; row < rows; ++row) {
+            if (model[row].find(needle) != std::string::npos)
+                expected.push_back(row);
+        }
+        for (const SearchKernel kernel : kernels()) {
+            RowSet set(rows);
+            column.find_containing(needle, kernel, set);
+            ASSERT_EQ(set.rows(), expected) << needle;
+        }
+    }
+}
+
 TEST(TextColumn, JoinedColumnsHoldBothRows) {
     TextColumn lower;
     TextColumn upper;
