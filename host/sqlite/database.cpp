@@ -136,6 +136,12 @@ std::int64_t Connection::query_integer(const char* sql, std::int64_t missing) {
     return statement.integer(0);
 }
 
+DatabaseResult Connection::error_result() const {
+    const DatabaseResult result =
+        connection_ ? result_of(sqlite3_errcode(connection_.get())) : DatabaseResult::failed;
+    return succeeded(result) ? DatabaseResult::failed : result;
+}
+
 std::int64_t Connection::last_insert_id() const {
     return sqlite3_last_insert_rowid(connection_.get());
 }

@@ -72,6 +72,8 @@ class Connection {
     DatabaseResult execute(const char* sql);
     /// First column of the first row, or `missing`.
     std::int64_t query_integer(const char* sql, std::int64_t missing);
+    /// What the last call failed with; `failed` when it did not.
+    DatabaseResult error_result() const;
     std::int64_t last_insert_id() const;
     bool in_transaction() const;
 

@@ -61,9 +61,13 @@ DatabaseResult IndexStore::open(const std::string& path, Connection::Mode mode) 
             return result;
         }
     }
-    if (version != kVersion || connection_.query_integer("PRAGMA application_id", -1) != kApplication) {
+    const std::int64_t application = connection_.query_integer("PRAGMA application_id", -1);
+    if (version != kVersion || application != kApplication) {
+        // What could not be read says nothing about the database.
+        const bool unread = version < 0 || application < 0;
+        result = unread ? connection_.error_result() : DatabaseResult::damaged;
         close();
-        return DatabaseResult::damaged;
+        return result;
     }
     return DatabaseResult::done;
 }
@@ -304,8 +308,12 @@ DatabaseResult IndexStore::erase(RowNumber id) {
     return statement("INSERT OR IGNORE INTO free_id VALUES(?)").bind(0, id).run();
 }
 
-RowNumber IndexStore::largest_row() {
-    return static_cast<RowNumber>(connection_.query_integer("SELECT max(id) FROM file", 0));
+DatabaseResult IndexStore::largest_row(RowNumber& largest) {
+    const std::int64_t found = connection_.query_integer("SELECT max(id) FROM file", -1);
+    if (found < 0)
+        return connection_.error_result();
+    largest = static_cast<RowNumber>(found);
+    return DatabaseResult::done;
 }
 
 DatabaseResult IndexStore::scan(RowNumber first, RowNumber last,
@@ -363,8 +371,9 @@ DatabaseResult IndexStore::log_changes(const std::vector<RowNumber>& rows, std::
         .run();
 }
 
-std::int64_t IndexStore::last_sequence() {
-    return connection_.query_integer("SELECT max(sequence) FROM change_log", 0);
+DatabaseResult IndexStore::last_sequence(std::int64_t& last) {
+    last = connection_.query_integer("SELECT max(sequence) FROM change_log", -1);
+    return last < 0 ? connection_.error_result() : DatabaseResult::done;
 }
 
 DatabaseResult IndexStore::changes_since(std::int64_t seen, std::vector<RowNumber>& rows, bool& whole,

@@ -80,7 +80,7 @@ class IndexStore {
     DatabaseResult insert(IndexRow& row);
     DatabaseResult update(const IndexRow& row);
     DatabaseResult erase(RowNumber id);
-    RowNumber largest_row();
+    DatabaseResult largest_row(RowNumber& largest);
     /// Calls for each row from `first` to `last`: number and record.
     DatabaseResult scan(RowNumber first, RowNumber last,
                         const std::function<void(RowNumber, std::span<const std::byte>)>& visit);
@@ -98,7 +98,7 @@ class IndexStore {
 
     /// Appends to the change log; the number it got.
     DatabaseResult log_changes(const std::vector<RowNumber>& rows, std::int64_t& sequence);
-    std::int64_t last_sequence();
+    DatabaseResult last_sequence(std::int64_t& last);
     /// Rows that were changed after `seen`. False in `whole` when the log does not reach back so far.
     DatabaseResult changes_since(std::int64_t seen, std::vector<RowNumber>& rows, bool& whole,
                                  std::int64_t& last);

@@ -14,7 +14,10 @@ DatabaseResult SearchColumns::find(IndexStore& store, const Condition& condition
                                    std::vector<RowNumber>& rows) {
     std::set<std::string> attributes;
     condition.collect_attributes(attributes);
-    const std::int64_t last = store.last_sequence();
+    std::int64_t last = 0;
+    DatabaseResult result = store.last_sequence(last);
+    if (!succeeded(result))
+        return result;
     {
         std::shared_lock lock(mutex_);
         if (table_.has(attributes) && seen_ >= last) {
@@ -23,7 +26,6 @@ DatabaseResult SearchColumns::find(IndexStore& store, const Condition& condition
         }
     }
     std::unique_lock lock(mutex_);
-    DatabaseResult result = DatabaseResult::done;
     if (!table_.has(attributes))
         result = load(store, attributes);
     else
@@ -46,15 +48,19 @@ DatabaseResult SearchColumns::load(IndexStore& store, const std::set<std::string
     table_.remove_all();
     std::map<std::uint32_t, AttributeName> names;
     // Rows that are committed during the scan are read again by the catch-up that follows.
-    const std::int64_t sequence = store.last_sequence();
-    DatabaseResult result = store.attributes(names);
+    std::int64_t sequence = 0;
+    RowNumber largest = 0;
+    DatabaseResult result = store.last_sequence(sequence);
+    if (succeeded(result))
+        result = store.attributes(names);
+    if (succeeded(result))
+        result = store.largest_row(largest);
     if (!succeeded(result))
         return result;
     const auto prepare = [&](ColumnTable& table) {
         table.set_names(names);
         table.add(all);
     };
-    const RowNumber largest = store.largest_row();
     prepare(table_);
     table_.reserve(largest + std::size_t{1});
     if (largest < kWorthASecondThread) {

@@ -95,6 +95,10 @@ bool VolumeIndex::open_locked(Opening opening) {
         return false;
     if (slots_.open(files_.slots()))
         queue_.show_in(slots_.own());
+    if (changes_missed_.exchange(false)) {
+        mark_incomplete_locked();
+        run_background();
+    }
     if (slots_.take_over_dead() || (found_unclean_ && !slots_.others_alive()))
         mark_suspect_locked();
     if (is_suspect_locked())
@@ -242,14 +246,16 @@ bool VolumeIndex::in_use() {
 }
 
 ChangeTicket VolumeIndex::attributes_changed(const EntryRef& ref) {
-    if (!in_use())
+    if (!in_use()) {
+        if (files_.exist())
+            changes_missed_ = true;
         return {};
+    }
     return queue_.put(ref.directory, ref.leaf, ChangeNote::Source::own);
 }
 
 void VolumeIndex::entry_changed(const EntryRef& ref) {
-    if (in_use())
-        queue_.put(ref.directory, ref.leaf, ChangeNote::Source::own);
+    (void)attributes_changed(ref);
 }
 
 void VolumeIndex::entry_observed(std::uint64_t directory, const std::string& leaf,
@@ -310,7 +316,7 @@ bool VolumeIndex::is_complete() {
 Status VolumeIndex::search(const Condition& condition, std::vector<RowNumber>& rows) {
     rows.clear();
     if (!in_use())
-        return {};
+        return files_.exist() ? Status(ENOTSUP) : Status();
     (void)flush();
     slots_.wait_for_others();
     if (take_over_dead())

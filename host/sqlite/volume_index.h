@@ -123,6 +123,8 @@ class VolumeIndex {
     bool found_unclean_ GUARDED_BY(mutex_) = false;
     std::thread writer_thread_ GUARDED_BY(mutex_);
     std::atomic<bool> open_{false};
+    /// Changes were reported while there was an index that could not be opened.
+    std::atomic<bool> changes_missed_{false};
 
     Mutex readers_mutex_;
     std::vector<std::unique_ptr<IndexStore>> readers_ GUARDED_BY(readers_mutex_);

@@ -79,7 +79,9 @@ Status VolumeIndex::walk_locked(Looking looking, const std::atomic<bool>* cancel
     if (!reader)
         return ENOTSUP;
     // A row's number may be given to another file meanwhile, so rows are told apart by where they stand.
-    const RowNumber largest = reader->largest_row();
+    RowNumber largest = 0;
+    if (!succeeded(reader->largest_row(largest)))
+        return ENOTSUP;
     RowSet seen(static_cast<std::size_t>(largest) + 1);
     std::vector<IndexStore::KnownDirectory> directories;
     std::unordered_set<std::uint64_t> known;

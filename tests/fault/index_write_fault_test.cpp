@@ -1,5 +1,5 @@
-// The database's writes fail, each in turn, with a full disk and with an I/O error. Queries stay right, and
-// the user sees no error.
+// The database's writes fail, each in turn, with a full disk and with an I/O error; then its reads. Queries
+// stay right, and the user sees no error.
 
 #include "../host/sqlite/index_fixture.h"
 #include <atomic>
@@ -16,7 +16,10 @@ std::atomic<int> failed_writes{0};
 std::mutex methods_mutex;
 /// The system's methods (another set for each kind of file) to those that fail.
 std::map<const sqlite3_io_methods*, sqlite3_io_methods> failing_methods;
+std::atomic<int> reads_until_failure{-1};
+std::atomic<int> failed_reads{0};
 std::atomic<int (*)(sqlite3_file*, const void*, int, sqlite3_int64)> real_write{nullptr};
+std::atomic<int (*)(sqlite3_file*, void*, int, sqlite3_int64)> real_read{nullptr};
 sqlite3_vfs* real_vfs = nullptr;
 sqlite3_vfs failing_vfs;
 
@@ -29,6 +32,20 @@ int failing_write(sqlite3_file* file, const void* data, int size, sqlite3_int64 
     return real_write.load()(file, data, size, position);
 }
 
+int failing_read(sqlite3_file* file, void* data, int size, sqlite3_int64 position) {
+    if (reads_until_failure >= 0 && (reads_until_failure == 0 || --reads_until_failure == 0)) {
+        ++failed_reads;
+        return SQLITE_IOERR_READ;
+    }
+    return real_read.load()(file, data, size, position);
+}
+
+// Pages that are mapped into memory would never be read.
+int no_pages(sqlite3_file*, sqlite3_int64, int, void** page) {
+    *page = nullptr;
+    return SQLITE_OK;
+}
+
 int opening(sqlite3_vfs*, const char* name, sqlite3_file* file, int flags, int* out_flags) {
     const int result = real_vfs->xOpen(real_vfs, name, file, flags, out_flags);
     if (result == SQLITE_OK && file->pMethods != nullptr) {
@@ -37,6 +54,9 @@ int opening(sqlite3_vfs*, const char* name, sqlite3_file* file, int flags, int* 
         if (is_new) {
             real_write = file->pMethods->xWrite;
             methods->second.xWrite = failing_write;
+            real_read = file->pMethods->xRead;
+            methods->second.xRead = failing_read;
+            methods->second.xFetch = no_pages;
         }
         file->pMethods = &methods->second;
     }
@@ -54,6 +74,7 @@ class IndexWriteFaultTest : public IndexFixture {
     }
     void TearDown() override {
         writes_until_failure = -1;
+        reads_until_failure = -1;
         IndexFixture::TearDown();
     }
     void fail_each_write(int code) {
@@ -63,7 +84,11 @@ class IndexWriteFaultTest : public IndexFixture {
         EXPECT_EQ(find(contains("A", "x")), Leaves{});
         failure = code;
         failed_writes = 0;
-        for (int write = 1; write <= 12; ++write) {
+        // Until the disk lasts for the whole round.
+        int write = 0;
+        for (int failed_before = -1; failed_writes != failed_before;) {
+            failed_before = failed_writes;
+            ASSERT_LT(++write, 1000);
             writes_until_failure = write;
             tag("3", "A", "x" + std::to_string(write));
             EXPECT_EQ(find(contains("A", "x" + std::to_string(write))), Leaves{"3"}) << write;
@@ -76,7 +101,8 @@ class IndexWriteFaultTest : public IndexFixture {
             untag("4", "A");
             EXPECT_EQ(find(contains("A", "")), Leaves{}) << write;
         }
-        EXPECT_GE(failed_writes, 12);
+        std::printf("%d writes a round\n", write);
+        EXPECT_GE(write, 12);
     }
 };
 
@@ -86,6 +112,32 @@ TEST_F(IndexWriteFaultTest, FullDisk) {
 
 TEST_F(IndexWriteFaultTest, WriteError) {
     fail_each_write(SQLITE_IOERR_WRITE);
+}
+
+TEST_F(IndexWriteFaultTest, ReadError) {
+    for (int i = 0; i < 300; ++i) {
+        make(std::to_string(i));
+        tag_outside(std::to_string(i), "A", "x" + std::string(200, 'y'));
+    }
+    ASSERT_TRUE(indexes().create(device_, "A", kText).ok());
+    EXPECT_EQ(find(contains("A", "x")).size(), 300U);
+    int read = 0;
+    failed_reads = 0;
+    for (int failed_before = -1; failed_reads != failed_before;) {
+        failed_before = failed_reads;
+        ASSERT_LT(++read, 1000);
+        indexes().shut_down();
+        reads_until_failure = read;
+        EXPECT_EQ(find(contains("A", "x")).size(), 300U) << read;
+        tag("7", "A", "z" + std::to_string(read));
+        EXPECT_EQ(find(contains("A", "z")), Leaves{"7"}) << read;
+        reads_until_failure = -1;
+        EXPECT_EQ(find(contains("A", "z")), Leaves{"7"}) << read;
+        tag("7", "A", "x");
+        EXPECT_EQ(find(contains("A", "x")).size(), 300U) << read;
+    }
+    std::printf("%d reads a round\n", read);
+    EXPECT_GE(read, 12);
 }
 
 } // namespace
