@@ -9,6 +9,7 @@
 #include "samples/SampleLibrary.h"
 #include "support/BareLoops.h"
 #include "support/Figures.h"
+#include "support/Surroundings.h"
 #include <IndexMaintenance.h>
 #include <OS.h>
 #include <Volume.h>
@@ -132,16 +133,8 @@ bool Apart(const std::function<bool()>& work) {
 int main(int argc, char** argv) {
     const std::size_t count = argc > 1 ? std::strtoull(argv[1], nullptr, 10) : 100'000;
     const int rounds = argc > 2 ? std::atoi(argv[2]) : 5;
-    std::string place = (argc > 3 ? fs::path(argv[3]) : fs::temp_directory_path()) / "quirnel-bench.XXXXXX";
-    if (mkdtemp(place.data()) == nullptr) {
-        std::perror("mkdtemp");
-        return 1;
-    }
-    const fs::path folder = place;
-    for (const char* variable : {"XDG_CONFIG_HOME", "XDG_DATA_HOME", "XDG_CACHE_HOME", "XDG_RUNTIME_DIR"})
-        setenv(variable, (folder / variable).c_str(), 1);
-    fs::create_directory(folder / "XDG_RUNTIME_DIR");
-    chmod((folder / "XDG_RUNTIME_DIR").c_str(), 0700);
+    const bench::Surroundings surroundings(argc > 3 ? argv[3] : nullptr);
+    const fs::path& folder = surroundings.Folder();
 
     const fs::path small_rates = folder / "small-rates";
     bool reached = Apart([&] {
@@ -175,6 +168,5 @@ int main(int argc, char** argv) {
             return all;
         }) &&
         reached;
-    fs::remove_all(folder);
     return reached ? 0 : 1;
 }

@@ -8,6 +8,7 @@
 #include "search/SongQuery.h"
 #include "support/Figures.h"
 #include "support/MpdClient.h"
+#include "support/Surroundings.h"
 #include <IndexMaintenance.h>
 #include <OS.h>
 #include <Query.h>
@@ -15,7 +16,6 @@
 #include <array>
 #include <cstdlib>
 #include <filesystem>
-#include <sys/stat.h>
 #include <unistd.h>
 
 namespace {
@@ -107,17 +107,6 @@ int Compare(const fs::path& folder, const fs::path& script, std::size_t count, i
 int main(int argc, char** argv) {
     const std::size_t count = argc > 1 ? std::strtoull(argv[1], nullptr, 10) : 100'000;
     const int frames = argc > 2 ? std::atoi(argv[2]) : 80;
-    std::string place = (argc > 3 ? fs::path(argv[3]) : fs::temp_directory_path()) / "quirnel-bench.XXXXXX";
-    if (mkdtemp(place.data()) == nullptr) {
-        std::perror("mkdtemp");
-        return 1;
-    }
-    const fs::path folder = place;
-    for (const char* variable : {"XDG_CONFIG_HOME", "XDG_DATA_HOME", "XDG_CACHE_HOME", "XDG_RUNTIME_DIR"})
-        setenv(variable, (folder / variable).c_str(), 1);
-    fs::create_directory(folder / "XDG_RUNTIME_DIR");
-    chmod((folder / "XDG_RUNTIME_DIR").c_str(), 0700);
-    const int status = Compare(folder, QUIRNEL_PEERS_FOLDER "/mpd", count, frames);
-    fs::remove_all(folder);
-    return status;
+    const bench::Surroundings surroundings(argc > 3 ? argv[3] : nullptr);
+    return Compare(surroundings.Folder(), QUIRNEL_PEERS_FOLDER "/mpd", count, frames);
 }

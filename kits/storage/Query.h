@@ -85,8 +85,9 @@ class BQuery : public BEntryList {
     // B_NOT_ALLOWED the second time, B_UNSUPPORTED when the volume answers no queries.
     status_t Fetch();
 
-    // In no particular order. B_FILE_ERROR before Fetch(), B_ENTRY_NOT_FOUND at the end. GetNextEntry() passes
-    // over entries that cannot be reached: those whose directory has gone since or may not be searched.
+    // In no particular order. B_FILE_ERROR before Fetch(), B_ENTRY_NOT_FOUND at the end. GetNextEntry()
+    // passes over entries that cannot be reached: those whose directory has gone since or may not be
+    // searched.
     status_t GetNextEntry(BEntry* entry, bool traverse = false) override;
     status_t GetNextRef(entry_ref* ref) override;
     int32 GetNextDirents(struct dirent* buffer, size_t length, int32 count = INT_MAX) override;

@@ -83,11 +83,14 @@ int RunOnVolumes(const Request& request, Job job, Output& output) {
     std::vector<ChosenVolume> volumes;
     if (request.arguments.empty()) {
         for (const ChosenVolume& volume : AllVolumes()) {
-            if (volume.volume.IsPersistent() && volume.volume.KnowsAttr() && volume.volume.KnowsQuery())
+            if (volume.volume.IsPersistent() && !volume.volume.IsReadOnly() && volume.volume.KnowsAttr() &&
+                volume.volume.KnowsQuery())
                 volumes.push_back(volume);
         }
         if (volumes.empty())
-            return Fail("no volume here holds attributes and answers queries");
+            return Fail(
+                "no volume here can be written, holds attributes and answers queries; 'quirnelctl volumes' "
+                "tells which, and queries need a data directory that can be written");
     } else {
         const auto named = VolumesOf(request.arguments, problem);
         if (!named)
