@@ -87,8 +87,8 @@ class Indexes {
     virtual void follow_changes() = 0;
 
     /// Brings the index up to date with directories that changed since it last looked, and (thorough) with
-    /// every indexed file. After a process died with changes not yet written, either depth is thorough. Blocks.
-    /// `cancelled` may be null.
+    /// every indexed file. After a process died with changes not yet written, either depth is thorough.
+    /// Blocks. `cancelled` may be null.
     enum class Depth { directories, thorough };
     virtual Status reconcile(DeviceId volume, Depth depth, const std::atomic<bool>* cancelled) = 0;
 
