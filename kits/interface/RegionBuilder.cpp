@@ -95,7 +95,7 @@ class BandWriter {
 // Emits the runs of one band for which `keep(inA, inB)` holds.
 template <typename Keep>
 void CombineRuns(Band a, Band b, Keep keep, BandWriter& out) {
-    constexpr int32 kNever = std::numeric_limits<int32>::max();
+    static constexpr int32 kNever = std::numeric_limits<int32>::max();
     std::size_t edgeA = 0; // even: outside, waiting for a run's left; odd: inside, waiting for its end
     std::size_t edgeB = 0;
     const auto edge = [](Band band, std::size_t index) {
