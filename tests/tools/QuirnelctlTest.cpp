@@ -186,7 +186,13 @@ TEST_F(QuirnelctlTest, MistakesAreNamedInOneLine) {
 TEST_F(QuirnelctlTest, InterruptingTheIndexJobLeavesWholeFilesAndSaysSo) {
     samples::WriteLargeLibrary(environment.volume(), 15'000);
     test::Program program(QUIRNELCTL, {"index", environment.volume()});
-    usleep(300'000);
+    // As soon as the job is seen at work.
+    for (size_t number = 0; program.running(); number = (number + 997) % 15'000) {
+        const samples::Sample song = samples::LargeLibrarySong(number);
+        if (Attribute(song.folder + "/" + song.name, "user.be.Audio:Songname") != "(none)")
+            break;
+        usleep(100);
+    }
     program.signal(SIGINT);
     const auto result = program.wait();
     ASSERT_EQ(result.status, 1) << result.output;
