@@ -1,72 +1,17 @@
 #include <String.h>
+#include <TextSearch.h>
 
 #include <algorithm>
 #include <cstring>
-#include <string_view>
 
-// How BStrings are compared, searched and replaced in.
+// How BStrings are compared and searched in.
+
+using namespace text_search;
 
 namespace {
 
-constexpr size_t kNowhere = std::string_view::npos;
-
-enum class Case { kExact, kAsciiBlind };
-
-char fold(char c) {
-    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-}
-
-bool same_byte(char first, char second, Case letters) {
-    return letters == Case::kExact ? first == second : fold(first) == fold(second);
-}
-
-std::string_view view(const char* text) {
-    return text != nullptr ? std::string_view(text) : std::string_view();
-}
-
-std::string_view view(const BString& string) {
-    return {string.String(), static_cast<size_t>(string.Length())};
-}
-
 std::string_view cut(std::string_view text, int32 length) {
     return text.substr(0, static_cast<size_t>(std::max(length, 0)));
-}
-
-int compare(std::string_view first, std::string_view second, Case letters) {
-    const size_t common = std::min(first.size(), second.size());
-    for (size_t index = 0; index < common; index++) {
-        const char a = letters == Case::kExact ? first[index] : fold(first[index]);
-        const char b = letters == Case::kExact ? second[index] : fold(second[index]);
-        if (a != b)
-            return static_cast<uchar>(a) < static_cast<uchar>(b) ? -1 : 1;
-    }
-    if (first.size() == second.size())
-        return 0;
-    return first.size() < second.size() ? -1 : 1;
-}
-
-bool equal(std::string_view first, std::string_view second, Case letters) {
-    return first.size() == second.size() && compare(first, second, letters) == 0;
-}
-
-size_t find_first(std::string_view text, std::string_view wanted, size_t from, Case letters) {
-    if (letters == Case::kExact)
-        return text.find(wanted, from);
-    for (size_t at = from; at <= text.size() && text.size() - at >= wanted.size(); at++) {
-        if (equal(text.substr(at, wanted.size()), wanted, letters))
-            return at;
-    }
-    return kNowhere;
-}
-
-size_t find_last(std::string_view text, std::string_view wanted, size_t end, Case letters) {
-    if (wanted.size() > end)
-        return kNowhere;
-    for (size_t at = end - wanted.size() + 1; at-- > 0;) {
-        if (equal(text.substr(at, wanted.size()), wanted, letters))
-            return at;
-    }
-    return kNowhere;
 }
 
 int32 first_offset(const BString& string, std::string_view wanted, int32 from, Case letters) {
@@ -82,51 +27,6 @@ int32 last_offset(const BString& string, std::string_view wanted, int32 before, 
     const size_t end = static_cast<size_t>(std::min(before, string.Length()));
     const size_t found = find_last(view(string), wanted, end, letters);
     return found == kNowhere ? B_ERROR : static_cast<int32>(found);
-}
-
-void replace_bytes(std::string& text, char from, char to, int32 maxCount, int32 fromOffset, Case letters) {
-    if (fromOffset < 0)
-        return;
-    for (size_t at = static_cast<size_t>(fromOffset); at < text.size() && maxCount > 0; at++) {
-        if (same_byte(text[at], from, letters)) {
-            text[at] = to;
-            maxCount--;
-        }
-    }
-}
-
-void replace_last_byte(std::string& text, char from, char to, Case letters) {
-    const auto found =
-        std::find_if(text.rbegin(), text.rend(), [=](char c) { return same_byte(c, from, letters); });
-    if (found != text.rend())
-        *found = to;
-}
-
-void replace_texts(std::string& text, const char* from, const char* to, int32 maxCount, int32 fromOffset,
-                   Case letters) {
-    const std::string_view wanted = view(from);
-    if (wanted.empty() || fromOffset < 0 || static_cast<size_t>(fromOffset) > text.size())
-        return;
-    const std::string_view replacement = view(to);
-    std::string result;
-    size_t copied = 0;
-    size_t at = static_cast<size_t>(fromOffset);
-    while (maxCount-- > 0 && (at = find_first(text, wanted, at, letters)) != kNowhere) {
-        result.append(text, copied, at - copied).append(replacement);
-        at += wanted.size();
-        copied = at;
-    }
-    result.append(text, copied, kNowhere);
-    text = std::move(result);
-}
-
-void replace_last_text(std::string& text, const char* from, const char* to, Case letters) {
-    const std::string_view wanted = view(from);
-    if (wanted.empty())
-        return;
-    const size_t at = find_last(text, wanted, text.size(), letters);
-    if (at != kNowhere)
-        text = text.substr(0, at).append(view(to)).append(text, at + wanted.size(), kNowhere);
 }
 
 } // namespace
@@ -277,100 +177,6 @@ bool BString::IEndsWith(const char* text) const {
     const std::string_view wanted = view(text);
     return text != nullptr && wanted.size() <= mText.size() &&
            equal(view(*this).substr(mText.size() - wanted.size()), wanted, Case::kAsciiBlind);
-}
-
-BString& BString::ReplaceFirst(char replaceThis, char withThis) {
-    return Replace(replaceThis, withThis, 1);
-}
-
-BString& BString::ReplaceLast(char replaceThis, char withThis) {
-    replace_last_byte(mText, replaceThis, withThis, Case::kExact);
-    return *this;
-}
-
-BString& BString::ReplaceAll(char replaceThis, char withThis, int32 fromOffset) {
-    return Replace(replaceThis, withThis, INT32_MAX, fromOffset);
-}
-
-BString& BString::Replace(char replaceThis, char withThis, int32 maxReplaceCount, int32 fromOffset) {
-    replace_bytes(mText, replaceThis, withThis, maxReplaceCount, fromOffset, Case::kExact);
-    return *this;
-}
-
-BString& BString::ReplaceFirst(const char* replaceThis, const char* withThis) {
-    return Replace(replaceThis, withThis, 1);
-}
-
-BString& BString::ReplaceLast(const char* replaceThis, const char* withThis) {
-    replace_last_text(mText, replaceThis, withThis, Case::kExact);
-    return *this;
-}
-
-BString& BString::ReplaceAll(const char* replaceThis, const char* withThis, int32 fromOffset) {
-    return Replace(replaceThis, withThis, INT32_MAX, fromOffset);
-}
-
-BString& BString::Replace(const char* replaceThis, const char* withThis, int32 maxReplaceCount,
-                          int32 fromOffset) {
-    replace_texts(mText, replaceThis, withThis, maxReplaceCount, fromOffset, Case::kExact);
-    return *this;
-}
-
-BString& BString::IReplaceFirst(char replaceThis, char withThis) {
-    return IReplace(replaceThis, withThis, 1);
-}
-
-BString& BString::IReplaceLast(char replaceThis, char withThis) {
-    replace_last_byte(mText, replaceThis, withThis, Case::kAsciiBlind);
-    return *this;
-}
-
-BString& BString::IReplaceAll(char replaceThis, char withThis, int32 fromOffset) {
-    return IReplace(replaceThis, withThis, INT32_MAX, fromOffset);
-}
-
-BString& BString::IReplace(char replaceThis, char withThis, int32 maxReplaceCount, int32 fromOffset) {
-    replace_bytes(mText, replaceThis, withThis, maxReplaceCount, fromOffset, Case::kAsciiBlind);
-    return *this;
-}
-
-BString& BString::IReplaceFirst(const char* replaceThis, const char* withThis) {
-    return IReplace(replaceThis, withThis, 1);
-}
-
-BString& BString::IReplaceLast(const char* replaceThis, const char* withThis) {
-    replace_last_text(mText, replaceThis, withThis, Case::kAsciiBlind);
-    return *this;
-}
-
-BString& BString::IReplaceAll(const char* replaceThis, const char* withThis, int32 fromOffset) {
-    return IReplace(replaceThis, withThis, INT32_MAX, fromOffset);
-}
-
-BString& BString::IReplace(const char* replaceThis, const char* withThis, int32 maxReplaceCount,
-                           int32 fromOffset) {
-    replace_texts(mText, replaceThis, withThis, maxReplaceCount, fromOffset, Case::kAsciiBlind);
-    return *this;
-}
-
-BString& BString::ReplaceSet(const char* setOfBytes, char with) {
-    for (size_t at = 0; (at = mText.find_first_of(view(setOfBytes), at)) != kNowhere; at++)
-        mText[at] = with;
-    return *this;
-}
-
-BString& BString::ReplaceSet(const char* setOfBytes, const char* with) {
-    const std::string_view set = view(setOfBytes);
-    std::string result;
-    size_t copied = 0;
-    size_t at = 0;
-    while ((at = mText.find_first_of(set, copied)) != kNowhere) {
-        result.append(mText, copied, at - copied).append(view(with));
-        copied = std::min(mText.find_first_not_of(set, at), mText.size());
-    }
-    result.append(mText, copied, kNowhere);
-    mText = std::move(result);
-    return *this;
 }
 
 bool operator<(const char* text, const BString& string) {
