@@ -70,6 +70,21 @@ enum { B_PRIMARY_MOUSE_BUTTON = 0x01, B_SECONDARY_MOUSE_BUTTON = 0x02, B_TERTIAR
 // What BView::MouseMoved() is told about the pointer.
 enum { B_ENTERED_VIEW = 0, B_INSIDE_VIEW, B_EXITED_VIEW, B_OUTSIDE_VIEW };
 
+typedef struct key_info {
+    uint32 modifiers;
+    uint8 key_states[16]; // a bit for each key number, most significant first
+} key_info;
+
+// The modifier keys held, as of the last event that any window of the program has had. Any thread. Control
+// counts as B_CONTROL_KEY and B_COMMAND_KEY, Alt as B_OPTION_KEY, the key with the logo as B_MENU_KEY.
+uint32 modifiers();
+// The modifiers are filled in; single keys are not known to a program on this desktop, their states are 0.
+status_t get_key_info(key_info* info);
+
+// The greatest time between the two presses of a double click, in microseconds.
+status_t get_click_speed(bigtime_t* speed);
+status_t set_click_speed(bigtime_t speed);
+
 // Event masks and their options for BView::SetMouseEventMask() and SetEventMask().
 enum { B_POINTER_EVENTS = 0x00000001, B_KEYBOARD_EVENTS = 0x00000002 };
 enum {

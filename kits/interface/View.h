@@ -11,6 +11,7 @@
 #include <vector>
 
 class BBitmap;
+class BCursor;
 class BMessage;
 class BPolygon;
 class BScrollBar;
@@ -266,6 +267,23 @@ class BView : public BHandler {
     uint32 EventMask() const { return mEventMask; }
     // For the time that a button is down; only from MouseDown().
     status_t SetMouseEventMask(uint32 mask, uint32 options = 0);
+
+    // The pointer's shape over this view and those below it that have none of their own. Null for none.
+    void SetViewCursor(const BCursor* cursor, bool sync = true);
+    // With a button held: what is dragged is shown as an outline (`dragRect`, in view coordinates) or as the
+    // picture, `offset` being the pointer's place in it; the view's window owns the picture from here on, the
+    // message stays the caller's. Views under the pointer hear of the message by MouseMoved(). Where the
+    // button is let go, the view gets MouseUp() and then the message, as one that was dropped, whose replies
+    // go to `replyTo`, or to this view. Other programs are offered the files of its entry_ref field "refs" to
+    // copy.
+    void DragMessage(BMessage* message, BRect dragRect, BHandler* replyTo = nullptr);
+    void DragMessage(BMessage* message, BBitmap* picture, BPoint offset, BHandler* replyTo = nullptr);
+    void DragMessage(BMessage* message, BBitmap* picture, drawing_mode mode, BPoint offset,
+                     BHandler* replyTo = nullptr);
+    // Draws an outline that follows the pointer while a button is held: as a whole, or with its left top
+    // corner where `startRect` has it.
+    void BeginRectTracking(BRect startRect, uint32 how = B_TRACK_WHOLE_RECT);
+    void EndRectTracking();
 
     // For the kit's own use, by what views are attached to. The host calls them for its topmost views alone.
     ViewHost* Host() const { return mHost; }
