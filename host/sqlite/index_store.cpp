@@ -1,32 +1,12 @@
 #include "host/sqlite/index_store.h"
+#include "host/sqlite/index_schema.h"
 #include <algorithm>
 #include <cstring>
 
 namespace host {
 namespace {
 
-constexpr std::int64_t kApplication = 0x626b6978;
 constexpr std::int64_t kKeptTransactions = 4096;
-
-constexpr const char* kSchema = R"sql(
-    BEGIN IMMEDIATE;
-    CREATE TABLE meta(key TEXT PRIMARY KEY, value) WITHOUT ROWID;
-    CREATE TABLE index_list(attribute TEXT NOT NULL UNIQUE, type INTEGER NOT NULL, created INTEGER NOT NULL);
-    CREATE TABLE attribute(id INTEGER PRIMARY KEY, name BLOB NOT NULL, type INTEGER NOT NULL, UNIQUE(name, type));
-    CREATE TABLE file(id INTEGER PRIMARY KEY, directory INTEGER NOT NULL, name BLOB NOT NULL,
-        inode INTEGER NOT NULL, change_time INTEGER NOT NULL, links INTEGER NOT NULL, settled INTEGER NOT NULL,
-        attributes BLOB NOT NULL);
-    CREATE UNIQUE INDEX file_place ON file(directory, name);
-    CREATE INDEX file_links ON file(inode) WHERE links > 1;
-    CREATE TABLE free_id(id INTEGER PRIMARY KEY);
-    CREATE TABLE directory(inode INTEGER PRIMARY KEY, parent INTEGER NOT NULL, name BLOB NOT NULL,
-        change_time INTEGER NOT NULL);
-    CREATE TABLE change_log(sequence INTEGER PRIMARY KEY, files BLOB NOT NULL);
-    INSERT INTO meta VALUES('clean', 1), ('complete', 0), ('walked', 0);
-    PRAGMA application_id = 0x626b6978;
-    PRAGMA user_version = 1;
-    COMMIT;
-)sql";
 
 std::int64_t as_signed(std::uint64_t number) {
     return static_cast<std::int64_t>(number);
@@ -39,37 +19,11 @@ std::uint64_t as_unsigned(std::int64_t number) {
 
 DatabaseResult IndexStore::open(const std::string& path, Connection::Mode mode) {
     DatabaseResult result = connection_.open(path, mode);
+    if (succeeded(result))
+        result = prepare_index_tables(connection_, mode);
     if (!succeeded(result))
-        return result;
-    result = connection_.execute("PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL;"
-                                 "PRAGMA cache_size = -16384; PRAGMA wal_autocheckpoint = 4000;"
-                                 "PRAGMA mmap_size = 1073741824; PRAGMA temp_store = MEMORY;");
-    if (!succeeded(result)) {
         close();
-        return result;
-    }
-    std::int64_t version = connection_.query_integer("PRAGMA user_version", -1);
-    const std::int64_t tables = connection_.query_integer("SELECT count(*) FROM sqlite_master", -1);
-    if (version == 0 && tables == 0 && mode == Connection::Mode::create) {
-        result = connection_.execute(kSchema);
-        if (!succeeded(result) && connection_.in_transaction())
-            connection_.execute("ROLLBACK");
-        // Another process may have made the tables in the same moment.
-        version = connection_.query_integer("PRAGMA user_version", -1);
-        if (result == DatabaseResult::failed || result == DatabaseResult::busy) {
-            close();
-            return result;
-        }
-    }
-    const std::int64_t application = connection_.query_integer("PRAGMA application_id", -1);
-    if (version != kVersion || application != kApplication) {
-        // What could not be read says nothing about the database.
-        const bool unread = version < 0 || application < 0;
-        result = unread ? connection_.error_result() : DatabaseResult::damaged;
-        close();
-        return result;
-    }
-    return DatabaseResult::done;
+    return result;
 }
 
 void IndexStore::close() {

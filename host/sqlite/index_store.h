@@ -43,8 +43,6 @@ struct AttributeName {
 /// Every call may answer `damaged` or `failed`; inside a transaction the caller then rolls back.
 class IndexStore {
   public:
-    static constexpr int kVersion = 1;
-
     /// Opens, and makes the tables in an empty file. `damaged` for another version or application, too.
     DatabaseResult open(const std::string& path, Connection::Mode mode);
     void close();

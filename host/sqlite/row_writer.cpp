@@ -37,6 +37,8 @@ DatabaseResult RowWriter::write(std::vector<ChangeNote>& notes, const std::set<s
     live_changes_.clear();
     last_directory_ = 0;
     last_handle_.reset();
+    for (const ChangeNote& note : notes)
+        ++(note.source == ChangeNote::Source::own ? statistics_.reported : statistics_.observed);
     // Equal notes are one, and a directory's notes together need it opened once.
     const auto place = [](const ChangeNote& note) {
         return std::tie(note.directory, note.leaf, note.source);
@@ -75,6 +77,7 @@ DatabaseResult RowWriter::write(std::vector<ChangeNote>& notes, const std::set<s
         changes_.clear();
         return result;
     }
+    statistics_.rows_changed += changes_.size();
     for (const LiveChange& change : live_changes_)
         change.query->entry_looked_at(change.directory, change.leaf, change.inode, change.was, change.is);
     return result;
@@ -221,6 +224,7 @@ DatabaseResult RowWriter::write_note(const ChangeNote& note, const std::set<std:
                 status.st_ino == old.inode && change_time_of(status) == old.change_time)
                 return DatabaseResult::done;
         }
+        ++(note.source == ChangeNote::Source::own ? statistics_.reported_read : statistics_.observed_read);
         const Status read = reader_.read(directory->descriptor(), device_, note.leaf.c_str(), state);
         there = read.ok();
         // Anything but "not there" says nothing about the entry: the row stays, hits look at the file anyway.

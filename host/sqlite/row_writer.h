@@ -13,6 +13,15 @@
 
 namespace host {
 
+/// What a writer has done since it was made.
+struct WriterStatistics {
+    std::uint64_t reported = 0;      ///< notes of changes that were made through the kits
+    std::uint64_t observed = 0;      ///< notes of a watcher or a walk, our own changes coming back among them
+    std::uint64_t reported_read = 0; ///< files whose attributes were read for the former
+    std::uint64_t observed_read = 0; ///< and for the latter: none where the row's change time was the file's
+    std::uint64_t rows_changed = 0;
+};
+
 /// Brings the rows of noted entries up to date, a group in one transaction. One thread at a time.
 class RowWriter {
   public:
@@ -26,6 +35,8 @@ class RowWriter {
     /// was committed.
     const std::vector<RowChange>& changes() const { return changes_; }
     std::int64_t sequence() const { return sequence_; }
+
+    const WriterStatistics& statistics() const { return statistics_; }
 
     /// Forgets what it remembers of the database: another one has taken its place.
     void reset();
@@ -59,6 +70,7 @@ class RowWriter {
     std::set<std::uint64_t> known_directories_;
     std::vector<RowChange> changes_;
     std::vector<LiveChange> live_changes_;
+    WriterStatistics statistics_;
     std::int64_t sequence_ = 0;
     std::uint64_t last_directory_ = 0;
     DirectoryCache::Handle last_handle_;

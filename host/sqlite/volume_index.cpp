@@ -27,16 +27,12 @@ VolumeIndex::~VolumeIndex() {
     queue_.stop();
     std::unique_ptr<ChangeWatcher> watcher;
     {
-        MutexLock lock(background_mutex_);
+        MutexLock lock(watcher_mutex_);
         watcher = std::move(watcher_);
     }
-    // Its thread may be about to start a walk, which takes the mutex.
+    // Its thread may be about to start a walk.
     watcher.reset();
-    {
-        MutexLock lock(background_mutex_);
-        if (background_.joinable())
-            background_.join();
-    }
+    background_.stop();
     std::thread writer;
     {
         MutexLock lock(mutex_);
@@ -44,10 +40,7 @@ VolumeIndex::~VolumeIndex() {
     }
     if (writer.joinable())
         writer.join();
-    {
-        MutexLock lock(readers_mutex_);
-        readers_.clear();
-    }
+    readers_.clear();
     MutexLock lock(mutex_);
     if (store_.is_open() && dirty_ && !lost_changes_ && !found_unclean_ && !is_suspect_locked() &&
         !slots_.others_alive())
@@ -97,7 +90,7 @@ bool VolumeIndex::open_locked(Opening opening) {
         queue_.show_in(slots_.own());
     if (changes_missed_.exchange(false)) {
         mark_incomplete_locked();
-        run_background();
+        background_.start();
     }
     if (slots_.take_over_dead() || (found_unclean_ && !slots_.others_alive()))
         mark_suspect_locked();
@@ -109,14 +102,15 @@ bool VolumeIndex::open_locked(Opening opening) {
     return true;
 }
 
-void VolumeIndex::start_over_locked() {
+void VolumeIndex::let_go_locked() {
     writer_.reset();
     store_.close();
     columns_.clear();
-    {
-        MutexLock lock(readers_mutex_);
-        readers_.clear();
-    }
+    readers_.clear();
+}
+
+void VolumeIndex::start_over_locked() {
+    let_go_locked();
     files_.discard_database();
     (void)open_store_locked();
 }
@@ -124,13 +118,7 @@ void VolumeIndex::start_over_locked() {
 void VolumeIndex::check_file_locked() {
     if (store_.is_open() && files_.database_inode() == database_inode_)
         return;
-    writer_.reset();
-    store_.close();
-    columns_.clear();
-    {
-        MutexLock lock(readers_mutex_);
-        readers_.clear();
-    }
+    let_go_locked();
     (void)open_store_locked();
 }
 
@@ -189,7 +177,7 @@ Status VolumeIndex::create(const std::string& attribute, std::uint32_t type) {
         (void)files_.write_list(list_);
         files_.protect();
     }
-    run_background();
+    background_.start();
     return {};
 }
 
@@ -276,7 +264,7 @@ void VolumeIndex::write_groups() {
         }
         queue_.set_committed(position);
         if (!written)
-            run_background();
+            background_.start();
     }
 }
 
@@ -358,57 +346,26 @@ void VolumeIndex::report_damage() {
     start_over_locked();
 }
 
-std::unique_ptr<IndexStore> VolumeIndex::borrow_reader() {
-    {
-        MutexLock lock(readers_mutex_);
-        if (!readers_.empty()) {
-            auto reader = std::move(readers_.back());
-            readers_.pop_back();
-            return reader;
-        }
-    }
-    auto reader = std::make_unique<IndexStore>();
-    if (!succeeded(reader->open(files_.database(), Connection::Mode::existing)))
-        return nullptr;
-    return reader;
+WriterStatistics VolumeIndex::statistics() {
+    MutexLock lock(mutex_);
+    return writer_.statistics();
 }
 
-void VolumeIndex::give_back_reader(std::unique_ptr<IndexStore> reader) {
-    constexpr std::size_t kept = 4;
-    MutexLock lock(readers_mutex_);
-    if (readers_.size() < kept)
-        readers_.push_back(std::move(reader));
-}
-
-void VolumeIndex::run_background() {
-    if (stopping_)
-        return;
-    MutexLock lock(background_mutex_);
-    // A walk under way notices by itself that it has to begin again.
-    if (background_runs_)
-        return;
-    if (background_.joinable())
-        background_.join();
-    background_runs_ = true;
-    background_ = std::thread([this] {
-        (void)set_thread_name(current_native_thread(), "index walker");
-        (void)set_thread_schedule(current_native_thread(), {process_niceness() + 10, io_class::idle});
-        Status status;
-        do {
-            // Somebody who could not wait may have walked already.
-            if (!reconcile_wanted_.exchange(false) && is_complete())
-                break;
-            status = walk_volume(Looking::changed_only, nullptr, nullptr, Ground::back);
-            // The database could not be written: a full disk has time to be seen to.
-            for (int i = 0; status.error() == ENOTSUP && i < kRetrySteps && !stopping_; ++i)
-                std::this_thread::sleep_for(kRetryStep);
-        } while (!stopping_ && (reconcile_wanted_ || status.error() == EAGAIN || status.error() == ENOTSUP));
-        background_runs_ = false;
-    });
+void VolumeIndex::work_in_background() {
+    Status status;
+    do {
+        // Somebody who could not wait may have walked already.
+        if (!reconcile_wanted_.exchange(false) && is_complete())
+            return;
+        status = walk_volume(Looking::changed_only, nullptr, nullptr, Ground::back);
+        // The database could not be written: a full disk has time to be seen to.
+        for (int i = 0; status.error() == ENOTSUP && i < kRetrySteps && !stopping_; ++i)
+            std::this_thread::sleep_for(kRetryStep);
+    } while (!stopping_ && (reconcile_wanted_ || status.error() == EAGAIN || status.error() == ENOTSUP));
 }
 
 void VolumeIndex::follow() {
-    MutexLock lock(background_mutex_);
+    MutexLock lock(watcher_mutex_);
     if (watcher_ || stopping_)
         return;
     ChangeWatcher::Sink sink;
@@ -421,7 +378,7 @@ void VolumeIndex::follow() {
 
 void VolumeIndex::reconcile_in_background() {
     reconcile_wanted_ = true;
-    run_background();
+    background_.start();
 }
 
 } // namespace host

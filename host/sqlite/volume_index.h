@@ -3,9 +3,11 @@
 #include "host/api/index.h"
 #include "host/api/thread_safety.h"
 #include "host/linux/change_watcher.h"
+#include "host/sqlite/background_task.h"
 #include "host/sqlite/change_queue.h"
 #include "host/sqlite/index_files.h"
 #include "host/sqlite/live_queries.h"
+#include "host/sqlite/reader_pool.h"
 #include "host/sqlite/row_writer.h"
 #include "host/sqlite/search_columns.h"
 #include "host/sqlite/shared_slots.h"
@@ -43,12 +45,14 @@ class VolumeIndex {
     Status search(const Condition& condition, std::vector<RowNumber>& rows);
 
     /// A connection to the database for reading, from a pool; null when it cannot be opened.
-    std::unique_ptr<IndexStore> borrow_reader();
-    void give_back_reader(std::unique_ptr<IndexStore> reader);
+    std::unique_ptr<IndexStore> borrow_reader() { return readers_.borrow(); }
+    void give_back_reader(std::unique_ptr<IndexStore> reader) { readers_.give_back(std::move(reader)); }
     /// A reader has met a damaged page.
     void report_damage();
 
     LiveQueries& live_queries() { return live_; }
+    /// What the writer has done since this index was opened.
+    WriterStatistics statistics();
 
     Status flush();
     Status reconcile(Indexes::Depth depth, const std::atomic<bool>* cancelled);
@@ -76,6 +80,8 @@ class VolumeIndex {
 
     bool open_locked(Opening opening) REQUIRES(mutex_);
     bool open_store_locked() REQUIRES(mutex_);
+    /// Closes all that is open on the database's file.
+    void let_go_locked() REQUIRES(mutex_);
     void start_over_locked() REQUIRES(mutex_);
     void check_file_locked() REQUIRES(mutex_);
     void write_groups();
@@ -97,7 +103,8 @@ class VolumeIndex {
     Status look_at_directories(const std::atomic<bool>* cancelled);
     void note_directory(IndexStore& reader, std::uint64_t directory, const Directory& opened,
                         std::vector<std::uint64_t>* subdirectories);
-    void run_background();
+    /// Walks until the index is complete and nobody wants it reconciled.
+    void work_in_background();
 
     const DeviceId device_;
     const std::string stable_key_;
@@ -126,19 +133,16 @@ class VolumeIndex {
     /// Changes were reported while there was an index that could not be opened.
     std::atomic<bool> changes_missed_{false};
 
-    Mutex readers_mutex_;
-    std::vector<std::unique_ptr<IndexStore>> readers_ GUARDED_BY(readers_mutex_);
-    std::uint64_t readers_inode_ GUARDED_BY(readers_mutex_) = 0;
+    ReaderPool readers_{files_.database()};
 
     /// One walk at a time.
     Mutex walk_mutex_;
     std::atomic<int> walks_waiting_{0};
     std::atomic<bool> gave_way_{false};
-    Mutex background_mutex_;
-    std::thread background_ GUARDED_BY(background_mutex_);
-    std::atomic<bool> background_runs_{false};
-    std::unique_ptr<ChangeWatcher> watcher_ GUARDED_BY(background_mutex_);
     std::atomic<bool> stopping_{false};
+    BackgroundTask background_{"index walker", [this] { work_in_background(); }};
+    Mutex watcher_mutex_;
+    std::unique_ptr<ChangeWatcher> watcher_ GUARDED_BY(watcher_mutex_);
 };
 
 } // namespace host
