@@ -26,15 +26,26 @@ class BApplication : public BLooper {
 
     // The application's messages are handled in a thread of their own until Quit(); this thread runs the
     // main loop (MainLoop.h) or waits. Returns that thread's id when all is over.
+    // From here to the end of the loop it is a running application (Roster.h), which other processes find by
+    // its signature. Where it may run only once and another one runs, that one is given this one's arguments
+    // and messages and brought to the front, and the answer is B_ALREADY_RUNNING at once, no hook having been
+    // called: main() then simply ends. Of two that start at the same moment exactly one runs.
     thread_id Run() override;
     // Ends Run(), in any thread.
     void Quit() override;
     bool QuitRequested() override;
 
     // Hooks, called in the application's thread.
+    // First of all come the command line, when there are arguments in it, and the messages that it was
+    // launched with; then ReadyToRun().
     virtual void ReadyToRun();
+    // The program's name and the arguments, also of a later start that was handed over to this one. The
+    // message at hand, B_ARGV_RECEIVED, holds "argc" (int32), "argv" and "cwd" (strings: the arguments, the
+    // directory that relative names in them start from).
     virtual void ArgvReceived(int32 argc, char** argv);
     virtual void RefsReceived(BMessage* message);
+    // True when a window of the program gets the focus, and when a program without a main loop is activated
+    // by another (BRoster::ActivateApp()) or started again.
     virtual void AppActivated(bool active);
     virtual void AboutRequested();
     // Every SetPulseRate() microseconds; 0, as at first, for never.

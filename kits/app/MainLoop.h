@@ -1,6 +1,8 @@
 // What the main thread does while the application runs. Internal to the kits.
 #pragma once
 
+#include <string>
+
 // Installed by whoever needs the main thread for itself (the windowing part); without one the main thread
 // just waits for the application's looper to end.
 class MainLoop {
@@ -13,6 +15,10 @@ class MainLoop {
     virtual bool Run() = 0;
     // Called once, from the application's looper thread, as it ends.
     virtual void Quit() = 0;
+    // Brings the program's windows to the front, because the user started the program again or another one
+    // asks for it. `token` is what the desktop gave for this (its activation token or start-up id), empty for
+    // none. Called from the application's looper thread; returns at once.
+    virtual void Activate(const std::string& token) { (void)token; }
 };
 
 // Before BApplication::Run(); the loop must outlive it. Null takes it away.

@@ -38,7 +38,7 @@ TEST_F(RosterTest, TheRunningApplicationIsFoundWhateverTheCaseOfItsSignature) {
     EXPECT_TRUE(be_roster->IsRunning("application/x-vnd.Test-Roster"));
     EXPECT_TRUE(be_roster->IsRunning("APPLICATION/X-VND.test-roster"));
     EXPECT_FALSE(be_roster->IsRunning("application/x-vnd.Test-Roster2"));
-    EXPECT_FALSE(be_roster->IsRunning(nullptr));
+    EXPECT_FALSE(be_roster->IsRunning(static_cast<const char*>(nullptr)));
     EXPECT_EQ(be_roster->TeamFor(kSignature), getpid());
     BList teams;
     be_roster->GetAppList(kSignature, &teams);
