@@ -1,5 +1,6 @@
 #include "indexing/FileIndexListItem.h"
 
+#include "indexing/VolumeRowLayout.h"
 #include "metadata/BrindleMetaData.h"
 #include "metadata/MusicAttributes.h"
 
@@ -8,14 +9,23 @@
 #include <Entry.h>
 #include <Node.h>
 #include <NodeInfo.h>
+#include <String.h>
 #include <View.h>
 
+#include <algorithm>
 #include <cstdio>
 
 namespace {
 
 constexpr int kStatusPasses = 300;
 constexpr bigtime_t kStatusPassTime = 10000;
+constexpr rgb_color kSelectedBackground = {192, 192, 192, 255};
+constexpr rgb_color kWhite = {255, 255, 255, 255};
+constexpr rgb_color kDarkBlue = {64, 64, 128, 255};
+constexpr rgb_color kBlack = {0, 0, 0, 255};
+// The text of a volume that cannot be indexed: black, lightened by 128.
+constexpr rgb_color kMidGrey = {128, 128, 128, 255};
+
 // The buffer that the predicate is read back into; nothing comes of it.
 constexpr size_t kPredicateBufferSize = 255;
 
@@ -196,8 +206,58 @@ void FileIndexListItem::GetStatusText(char (&text)[kJobStatusTextSize]) const {
     FormatJobStatus(State(), Progress(), FileCount(), text);
 }
 
-void FileIndexListItem::DrawItem(BView* owner, BRect frame, bool) {
-    char text[kJobStatusTextSize];
-    GetStatusText(text);
-    owner->DrawString(text, BPoint(frame.left, frame.bottom));
+void FileIndexListItem::Update(BView* owner, const BFont* font) {
+    BListItem::Update(owner, font);
+    SetHeight(std::max(Height(), kVolumeRowHeight));
+}
+
+void FileIndexListItem::DrawItem(BView* owner, BRect frame, bool complete) {
+    const VolumeRowLayout layout(frame);
+    const rgb_color background = IsSelected() ? kSelectedBackground : kWhite;
+    const rgb_color textColor = mSupported || IsSelected() ? kBlack : kMidGrey;
+
+    owner->PushState();
+    owner->SetLowColor(background);
+    if (IsSelected() || complete)
+        owner->FillRect(frame, B_SOLID_LOW);
+    owner->SetDrawingMode(B_OP_OVER);
+    if (mIcon)
+        owner->DrawBitmap(mIcon.get(), layout.icon);
+    DrawName(owner, layout, textColor);
+
+    // One look at the job for bar and text, so that they agree.
+    const float progress = Progress();
+    if (mSupported) {
+        DrawBar(owner, layout.bar, progress);
+    } else {
+        owner->SetHighColor(textColor);
+        owner->DrawString("Unsupported", layout.unsupported);
+    }
+    char status[kJobStatusTextSize];
+    FormatJobStatus(State(), progress, FileCount(), status);
+    owner->SetHighColor(textColor);
+    owner->DrawString(status, layout.status);
+    owner->PopState();
+}
+
+void FileIndexListItem::DrawName(BView* owner, const VolumeRowLayout& layout, rgb_color color) const {
+    char name[B_FILE_NAME_LENGTH] = "";
+    mEntry->volume->GetName(name);
+    owner->SetFontSize(kVolumeRowFontSize);
+    // A longer name would run into the bar.
+    BString shown(name);
+    owner->TruncateString(&shown, B_TRUNCATE_END, kVolumeNameWidth);
+    owner->SetHighColor(color);
+    owner->DrawString(shown.String(), layout.name);
+}
+
+void FileIndexListItem::DrawBar(BView* owner, BRect bar, float progress) const {
+    const BarFill fill(bar, progress);
+    owner->SetDrawingMode(B_OP_COPY);
+    owner->SetHighColor(kDarkBlue);
+    owner->SetLowColor(kWhite);
+    owner->FillRect(fill.empty, B_SOLID_LOW);
+    owner->FillRect(fill.filled, progress == kProgressUnknown ? mStripePattern : B_SOLID_HIGH);
+    owner->StrokeRect(bar);
+    owner->SetDrawingMode(B_OP_OVER);
 }

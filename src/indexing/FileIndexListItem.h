@@ -13,6 +13,7 @@
 
 class BBitmap;
 class BNode;
+struct VolumeRowLayout;
 
 // At most one job at a time, on a thread of its own at low priority:
 //   status  counts nothing, it moves the progress for three seconds;
@@ -49,7 +50,10 @@ class FileIndexListItem : public BListItem {
     // Removes the music attributes of one file, ignoring errors.
     void RemoveAttributes(BNode* node);
 
+    // Icon, name, progress bar and status text; "Unsupported" in the bar's place where there can be no job.
     void DrawItem(BView* owner, BRect frame, bool complete = false) override;
+    // As high as a line of text, but no lower than the icon needs.
+    void Update(BView* owner, const BFont* font) override;
 
     // A job is at work.
     bool IsRunning() const { return mRunning.load(std::memory_order_acquire); }
@@ -81,6 +85,9 @@ class FileIndexListItem : public BListItem {
     void StatAttributesThread();
     void EraseAttributesThread();
     void IndexAttributesThread();
+
+    void DrawName(BView* owner, const VolumeRowLayout& layout, rgb_color color) const;
+    void DrawBar(BView* owner, BRect bar, float progress) const;
 
     void StartJob(thread_func function, const char* threadName, JobState state);
     void StopThread();

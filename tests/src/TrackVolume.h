@@ -35,6 +35,8 @@ class TestVolumes {
     const std::string& Second() const { return mSecond; }
     // One that a test may remove.
     const std::string& Passing() const { return mPassing; }
+    // One whose name is too long for a row.
+    const std::string& LongName() const { return mLongName; }
     // One that cannot be written, holding "Artist - Song.mp3" without attributes. Empty where this process
     // may not mount file systems.
     const std::string& ReadOnly() const { return mReadOnly; }
@@ -46,10 +48,11 @@ class TestVolumes {
 
   private:
     TestVolumes() {
-        for (const std::string& directory : {mMusic, mSecond, mPassing})
+        for (const std::string& directory : {mMusic, mSecond, mPassing, mLongName})
             std::filesystem::create_directory(directory);
         MountReadOnly(mEnvironment.root() + "/ReadOnly");
-        std::string declared = mMusic + ":" + mSecond + ":" + mPassing + ":" + WithoutAttributes();
+        std::string declared =
+            mMusic + ":" + mSecond + ":" + mPassing + ":" + mLongName + ":" + WithoutAttributes();
         if (!mReadOnly.empty())
             declared += ":" + mReadOnly;
         mEnvironment.declare_volumes(declared);
@@ -74,6 +77,7 @@ class TestVolumes {
     std::string mMusic = mEnvironment.root() + "/Music";
     std::string mSecond = mEnvironment.root() + "/Second";
     std::string mPassing = mEnvironment.root() + "/Passing";
+    std::string mLongName = mEnvironment.root() + "/Everything that was ever recorded in the old barn";
     std::string mReadOnly;
 };
 

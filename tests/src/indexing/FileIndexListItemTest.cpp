@@ -6,7 +6,6 @@
 
 #include <Bitmap.h>
 #include <Node.h>
-#include <View.h>
 
 #include <sys/mount.h>
 #include <unistd.h>
@@ -333,30 +332,6 @@ TEST_F(VolumeJob, CancellingAnIndexStopsItWithinAFile) {
         tagged += RawAttribute(path, "Audio:Songname").has_value();
     }
     EXPECT_EQ(tagged, count);
-}
-
-TEST_F(VolumeJob, DrawsItsStatusText) {
-    BBitmap bitmap(BRect(0, 0, 99, 19), B_RGB32, true);
-    auto* view = new BView(bitmap.Bounds(), "", 0, 0);
-    bitmap.AddChild(view);
-    const auto inkAfterDrawing = [&] {
-        EXPECT_TRUE(bitmap.Lock());
-        view->SetHighColor(255, 255, 255);
-        view->FillRect(bitmap.Bounds());
-        view->SetHighColor(0, 0, 0);
-        mItem->DrawItem(view, BRect(0, 0, 99, 15), false);
-        view->Sync();
-        bitmap.Unlock();
-        const auto* bits = static_cast<const uint8*>(bitmap.Bits());
-        int ink = 0;
-        for (int32 i = 0; i < bitmap.BitsLength(); i += 4)
-            ink += bits[i] < 128;
-        return ink;
-    };
-
-    EXPECT_EQ(inkAfterDrawing(), 0);
-    mItem->CancelScan();
-    EXPECT_GT(inkAfterDrawing(), 20);
 }
 
 } // namespace
