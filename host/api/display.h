@@ -143,24 +143,29 @@ struct DragInput {
     PointerPosition on_screen;
     std::uint32_t buttons = 0;
     std::uint32_t modifiers = 0;
-    // The same object for all events of one drag; of the types that WindowOptions::drop_types names. Null for
-    // `left`.
+    // The same object for all events of one drag; of its types the three below. Null for `left`, and for a
+    // drag that this process has begun.
     std::shared_ptr<const DataFormats> data;
-    // The drag was begun by this process. Position of the pointer in the dragged picture.
-    bool own = false;
-    PointerPosition offset;
+    bool own = false; // begun by this process
     std::int64_t when = 0;
 };
 
 enum class WindowState : std::uint8_t { normal, minimized, maximized };
+
+// The MIME types that are read from drags of other programs. A message of the kits, flattened, is preferred
+// to all others.
+inline constexpr std::string_view message_type = "application/x-vnd.bekits-message";
+inline constexpr std::string_view uri_list_type = "text/uri-list";
+inline constexpr std::string_view text_type = "text/plain";
 
 // Receives what happens to a window. Kept alive by the window's peer; never called after
 // WindowPeer::close() has been carried out, but still while it is on its way.
 class WindowListener {
   public:
     virtual ~WindowListener() = default;
-    // The content's place and size, as the desktop has made them. Also after a wish of our own.
-    virtual void area_changed(Area content) = 0;
+    // The content's place and size, as the desktop has made them, after the first `wishes` calls of
+    // set_area() were carried out. Also when a wish of our own was fulfilled.
+    virtual void area_changed(Area content, std::uint64_t wishes) = 0;
     // Device pixels for one logical pixel.
     virtual void scale_changed(double scale) = 0;
     virtual void margins_changed(FrameMargins margins) = 0;
@@ -178,6 +183,8 @@ class WindowListener {
     // Only for the bottom one of the shown pop-ups.
     virtual void popups_dismissed() = 0;
     virtual void screens_changed() = 0;
+    // Time for set_pulse().
+    virtual void pulse() = 0;
 };
 
 enum class WindowKind : std::uint8_t {
@@ -276,6 +283,8 @@ class WindowPeer {
     // To the front and, unless it takes no focus, active.
     virtual void activate() = 0;
     virtual void send_behind() = 0;
+    // Has the listener hear a pulse every so many microseconds; 0 for none, which costs nothing.
+    virtual void set_pulse(std::int64_t interval) = 0;
     // Above that window, as its dialogue. Null for none.
     virtual void set_parent(const std::shared_ptr<WindowPeer>& parent) = 0;
     virtual void set_cursor(const Cursor& cursor) = 0;

@@ -38,4 +38,9 @@ class KeyMenuTarget {
     virtual void OpenByKey() = 0;
     // Alt and this character. False when no menu's title has it.
     virtual bool OpenByCharacter(const char* bytes, int32 count) = 0;
+    // A key was pressed with B_COMMAND_KEY (Control). Invokes the item of any of the bar's menus that has
+    // this shortcut: `key` a character in upper case, or a code as B_DELETE; `modifiers` of B_COMMAND_KEY,
+    // B_SHIFT_KEY, B_OPTION_KEY alone. True when there is one, also a disabled one. So items do not have to
+    // register with the window.
+    virtual bool InvokeShortcut(uint32 key, uint32 modifiers) = 0;
 };

@@ -128,9 +128,12 @@ class BWindow : public BLooper {
     virtual void Zoom(BPoint leftTop, float width, float height);
     void SetZoomLimits(float maxWidth, float maxHeight);
 
-    // Handles shortcuts and the keys that navigate, before a key is given to the focus. `message` belongs to
-    // the window from here on and goes to `target`, without one to the window; a null message takes the
-    // shortcut's key without effect. B_COMMAND_KEY is added to the modifiers. Control counts as it.
+    // What a key with B_COMMAND_KEY (Control counts as it, and it is always added) means, before the focus
+    // gets to see it: a shortcut of the window, an item of the key menu bar, or else one of those every
+    // window has: W closes the window, Q ends the application, X, C, V, A and Z send B_CUT, B_COPY, B_PASTE,
+    // B_SELECT_ALL and B_UNDO to the focus view. `message` belongs to the window from here on; it goes to the
+    // window, or to `target`, with a null target to the focus view. A null message makes the key mean
+    // nothing.
     void AddShortcut(uint32 key, uint32 modifiers, BMessage* message);
     void AddShortcut(uint32 key, uint32 modifiers, BMessage* message, BHandler* target);
     bool HasShortcut(uint32 key, uint32 modifiers);
