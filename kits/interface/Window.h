@@ -32,7 +32,7 @@ enum window_look {
     B_BORDERED_WINDOW_LOOK = 20
 };
 
-enum window_feel {
+enum window_feel : int32 {
     B_NORMAL_WINDOW_FEEL = 0,
     B_MODAL_APP_WINDOW_FEEL = 1,
     B_MODAL_SUBSET_WINDOW_FEEL = 2,
