@@ -38,6 +38,8 @@ class Node {
     virtual ~Node() = default;
 
     virtual Result<NodeStat> stat() = 0;
+    /// As stat() says it, mostly without asking the system.
+    virtual Result<NodeKind> kind() = 0;
     virtual Result<std::size_t> read_at(std::int64_t position, void* buffer, std::size_t size) = 0;
     virtual Result<std::size_t> write_at(std::int64_t position, const void* data, std::size_t size) = 0;
     virtual Status set_size(std::int64_t size) = 0;
@@ -99,6 +101,8 @@ class FileSystem {
     /// The entry by which a directory is known in its parent. For a volume's root: its entry in the directory
     /// above, or leaf "." in itself for "/".
     virtual Result<EntryRef> entry_of_directory(const NodeId& directory) = 0;
+    /// Whether the directory of the reference is there; the leaf need not be.
+    virtual Status check_directory(const EntryRef& ref) = 0;
     virtual Result<NodeId> root_of(DeviceId volume) = 0;
 
     virtual Result<NodeStat> stat(const EntryRef& ref) = 0;

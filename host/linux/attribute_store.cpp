@@ -2,6 +2,7 @@
 
 #include "host/api/thread_safety.h"
 #include "host/linux/attribute_name.h"
+#include "host/linux/attribute_snapshot.h"
 #include "host/linux/attribute_writer.h"
 #include "host/linux/blob_store.h"
 #include "host/linux/raw_attribute.h"
@@ -43,6 +44,18 @@ Status read_start(const AttributeFile& file, const AttributeName& name, std::spa
     return read_fully(blob->get(), start.data(), count, 0);
 }
 
+// Whatever came of it: an attempt that failed may have moved other values.
+class ChangeOfVolume {
+  public:
+    explicit ChangeOfVolume(DeviceId device) : device_(device) {}
+    ~ChangeOfVolume() { AttributeSnapshot::volume_changed(device_); }
+    ChangeOfVolume(const ChangeOfVolume&) = delete;
+    ChangeOfVolume& operator=(const ChangeOfVolume&) = delete;
+
+  private:
+    const DeviceId device_;
+};
+
 Status list_names(int descriptor, std::vector<char>& list) {
     for (std::size_t capacity = std::max<std::size_t>(list.capacity(), 1024);; capacity = XATTR_LIST_MAX) {
         list.resize(capacity);
@@ -63,7 +76,7 @@ Result<AttributeInfo> attribute_info(const AttributeFile& file, const char* name
     if (extended.error() != 0)
         return Status(extended.error());
     RawAttribute raw;
-    if (const Status loaded = raw.load(file.descriptor, extended.text()); !loaded.ok())
+    if (const Status loaded = raw.load(file, extended.text()); !loaded.ok())
         return loaded;
     if (raw.spilled()) {
         const Result<Descriptor> blob = blob_store::open(file.device, file.descriptor, raw.marker());
@@ -79,7 +92,7 @@ Result<std::size_t> read_attribute(const AttributeFile& file, const char* name, 
     if (extended.error() != 0 || offset < 0)
         return Status(extended.error() != 0 ? extended.error() : EINVAL);
     RawAttribute raw;
-    if (const Status loaded = raw.load(file.descriptor, extended.text()); !loaded.ok())
+    if (const Status loaded = raw.load(file, extended.text()); !loaded.ok())
         return loaded;
 
     const std::size_t left = offset < raw.size() ? static_cast<std::size_t>(raw.size() - offset) : 0;
@@ -98,6 +111,7 @@ Result<std::size_t> read_attribute(const AttributeFile& file, const char* name, 
 
 Status write_attribute(const AttributeFile& file, const char* name, std::uint32_t type, std::int64_t offset,
                        const void* data, std::size_t size) {
+    const ChangeOfVolume change(file.device);
     const AttributeName extended(name);
     if (extended.error() != 0 || offset < 0)
         return extended.error() != 0 ? extended.error() : EINVAL;
@@ -119,6 +133,7 @@ Status write_attribute(const AttributeFile& file, const char* name, std::uint32_
 }
 
 Status remove_attribute(const AttributeFile& file, const char* name) {
+    const ChangeOfVolume change(file.device);
     const AttributeName extended(name);
     if (extended.error() != 0)
         return extended.error();
@@ -128,6 +143,7 @@ Status remove_attribute(const AttributeFile& file, const char* name) {
 }
 
 Status rename_attribute(const AttributeFile& file, const char* from, const char* to) {
+    const ChangeOfVolume change(file.device);
     const AttributeName old_name(from);
     const AttributeName new_name(to);
     if (old_name.error() != 0 || new_name.error() != 0)
@@ -148,12 +164,16 @@ Status rename_attribute(const AttributeFile& file, const char* from, const char*
 }
 
 Result<std::vector<std::string>> attribute_names(const AttributeFile& file) {
+    std::vector<std::string> names;
+    const auto add = [&](const char*, std::string_view name) { names.emplace_back(name); };
+    if (file.recent != nullptr && (file.recent->is_fresh() || file.recent->take(file.descriptor).ok())) {
+        for_each_attribute(file.recent->list().data(), file.recent->list().size(), add);
+        return names;
+    }
     std::vector<char> list;
     if (const Status listed = list_names(file.descriptor, list); !listed.ok())
         return listed;
-    std::vector<std::string> names;
-    for_each_attribute(list.data(), list.size(),
-                       [&](const char*, std::string_view name) { names.emplace_back(name); });
+    for_each_attribute(list.data(), list.size(), add);
     return names;
 }
 

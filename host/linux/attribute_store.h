@@ -10,6 +10,8 @@
 
 namespace host {
 
+class AttributeSnapshot;
+
 /// Attributes of an open file: see docs/attributes.md for how they lie on disk. Works on a plain descriptor
 /// (not one opened with O_PATH) of a file on `device`, which says where values too large for the file system
 /// go. Nothing here tells the index of a change: Node does. Any thread; concurrent writers of one attribute
@@ -17,6 +19,8 @@ namespace host {
 struct AttributeFile {
     int descriptor = -1;
     DeviceId device = 0;
+    /// Where given, reading asks it first and leaves in it what it finds. Must outlive the call.
+    AttributeSnapshot* recent = nullptr;
 };
 
 /// ENOENT: no such attribute, or its bytes are missing or damaged. ENAMETOOLONG: over 247 bytes. EINVAL:

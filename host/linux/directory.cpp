@@ -24,15 +24,6 @@ bool is_settled(std::int64_t change_time) {
     return age > kTick;
 }
 
-bool rename_moves_change_time(int descriptor) {
-    constexpr unsigned long kXfsMagic = 0x58465342;
-    struct statfs status = {};
-    if (system_calls().fstatfs(descriptor, &status) != 0)
-        return false;
-    const auto type = static_cast<unsigned long>(status.f_type);
-    return type == EXT4_SUPER_MAGIC || type == BTRFS_SUPER_MAGIC || type == TMPFS_MAGIC || type == kXfsMagic;
-}
-
 } // namespace
 
 Directory::Directory(Descriptor descriptor, DeviceId device, const struct stat& status)
@@ -68,32 +59,61 @@ Result<std::string> Directory::path() const {
     return path;
 }
 
-Result<std::string> Directory::leaf() const {
+// Whether the file system moves a directory's change time when it is renamed or moved, and counts its links
+// down when it is removed.
+bool Directory::keeps_books() const {
+    constexpr unsigned long kXfsMagic = 0x58465342;
+    Answer answer = keeps_books_.load(std::memory_order_relaxed);
+    if (answer == Answer::unknown) {
+        struct statfs status = {};
+        if (system_calls().fstatfs(descriptor(), &status) != 0)
+            return false;
+        const auto type = static_cast<unsigned long>(status.f_type);
+        const bool does =
+            type == EXT4_SUPER_MAGIC || type == BTRFS_SUPER_MAGIC || type == TMPFS_MAGIC || type == kXfsMagic;
+        answer = does ? Answer::yes : Answer::no;
+        keeps_books_.store(answer, std::memory_order_relaxed);
+    }
+    return answer == Answer::yes;
+}
+
+Result<Directory::Place> Directory::place() const {
     struct stat status = {};
     if (system_calls().fstat(descriptor(), &status) != 0)
         return Status(errno);
+    if (status.st_nlink == 0)
+        return Status(ENOENT);
     const std::int64_t change_time = nanoseconds(status.st_ctim);
     {
-        MutexLock lock(leaf_mutex_);
-        if (leaf_change_time_ == change_time && change_time >= 0)
-            return leaf_;
+        MutexLock lock(place_mutex_);
+        if (place_change_time_ == change_time && change_time >= 0)
+            return place_;
     }
     const Result<std::string> whole = path();
     if (!whole.ok())
-        return whole;
-    std::string leaf = *whole == "/" ? "." : whole->substr(whole->rfind('/') + 1);
-    const bool lasting = is_settled(change_time) && rename_moves_change_time(descriptor());
-    MutexLock lock(leaf_mutex_);
-    leaf_ = leaf;
-    leaf_change_time_ = lasting ? change_time : -1;
-    return leaf;
+        return whole.status();
+    struct stat above = {};
+    if (system_calls().fstatat(descriptor(), "..", &above, 0) != 0)
+        return Status(errno);
+    Place place{*whole == "/" ? "." : whole->substr(whole->rfind('/') + 1), above.st_dev, above.st_ino};
+    // What is above a file system's root is another file system's matter, whose changes do not show here.
+    const bool lasting = above.st_dev == file_system_device_ && is_settled(change_time) && keeps_books();
+    MutexLock lock(place_mutex_);
+    place_ = place;
+    place_change_time_ = lasting ? change_time : -1;
+    return place;
 }
 
-Result<std::uint64_t> Directory::parent_inode() const {
+Status Directory::check_exists(const char* leaf) const {
     struct stat status = {};
-    if (system_calls().fstatat(descriptor(), "..", &status, 0) != 0)
-        return Status(errno);
-    return std::uint64_t{status.st_ino};
+    if (system_calls().fstat(descriptor(), &status) != 0)
+        return errno;
+    if (status.st_nlink == 0)
+        return ENOENT;
+    if (keeps_books() ||
+        system_calls().fstatat(descriptor(), leaf, &status, AT_SYMLINK_NOFOLLOW | AT_NO_AUTOMOUNT) == 0)
+        return {};
+    return errno == ENOENT ? path().status() : Status(errno);
 }
 
 } // namespace host

@@ -290,10 +290,9 @@ void DirectoryCache::remember(DeviceId device, std::uint64_t inode, std::uint64_
 
 void DirectoryCache::remember_closed(const std::vector<Handle>& closed) {
     for (const Handle& directory : closed) {
-        const Result<std::string> leaf = directory->leaf();
-        const Result<std::uint64_t> parent = directory->parent_inode();
-        if (leaf.ok() && parent.ok())
-            remember(directory->device(), directory->inode(), *parent, *leaf);
+        const Result<Directory::Place> place = directory->place();
+        if (place.ok())
+            remember(directory->device(), directory->inode(), place->parent_inode, place->leaf);
     }
 }
 

@@ -50,6 +50,16 @@ Result<NodeStat> FileNode::stat() {
     return to_node_stat(status, device_);
 }
 
+Result<NodeKind> FileNode::kind() {
+    if (!kind_) {
+        const Result<NodeStat> found = stat();
+        if (!found.ok())
+            return found.status();
+        kind_ = found->kind;
+    }
+    return *kind_;
+}
+
 Result<std::size_t> FileNode::read_at(std::int64_t position, void* buffer, std::size_t size) {
     ssize_t count = -1;
     do {

@@ -2,8 +2,10 @@
 
 #include "host/api/file_system.h"
 #include "host/api/index.h"
+#include "host/linux/attribute_snapshot.h"
 #include "host/linux/attribute_store.h"
 #include "host/linux/descriptor.h"
+#include <optional>
 
 namespace host {
 
@@ -11,13 +13,15 @@ namespace host {
 /// files that may not be read) can be looked at, but have no attributes and no content.
 class FileNode final : public Node {
   public:
-    /// `device` is the node's own volume, `ref` the entry by which it was opened.
-    FileNode(Descriptor descriptor, DeviceId device, const EntryRef& ref)
-        : descriptor_(std::move(descriptor)), device_(device), ref_(ref) {}
+    /// `device` is the node's own volume, `ref` the entry by which it was opened, `kind` what it was found to
+    /// be where that is known.
+    FileNode(Descriptor descriptor, DeviceId device, const EntryRef& ref, std::optional<NodeKind> kind)
+        : descriptor_(std::move(descriptor)), device_(device), ref_(ref), kind_(kind), recent_(device) {}
     /// Tells the index when the content has been changed.
     ~FileNode() override;
 
     Result<NodeStat> stat() override;
+    Result<NodeKind> kind() override;
     Result<std::size_t> read_at(std::int64_t position, void* buffer, std::size_t size) override;
     Result<std::size_t> write_at(std::int64_t position, const void* data, std::size_t size) override;
     Status set_size(std::int64_t size) override;
@@ -38,12 +42,14 @@ class FileNode final : public Node {
     Status rename_attribute(const std::string& from, const std::string& to) override;
 
   private:
-    AttributeFile file() const { return {descriptor_.get(), device_}; }
+    AttributeFile file() { return {descriptor_.get(), device_, &recent_}; }
     Status report(Status outcome);
 
     const Descriptor descriptor_;
     const DeviceId device_;
     const EntryRef ref_;
+    std::optional<NodeKind> kind_;
+    AttributeSnapshot recent_;
     ChangeTicket ticket_;
     bool content_changed_ = false;
 };

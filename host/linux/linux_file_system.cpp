@@ -5,6 +5,7 @@
 #include "host/linux/file_node.h"
 #include "host/linux/node_stat.h"
 #include "host/linux/opening.h"
+#include "host/linux/seen_entry.h"
 #include "host/linux/system_calls.h"
 #include <cerrno>
 #include <climits>
@@ -101,12 +102,19 @@ Result<std::unique_ptr<Node>> LinuxFileSystem::open(const EntryRef& ref, const O
     const Result<Handle> directory = directory_of(ref);
     if (!directory.ok())
         return directory.status();
+    if (only_looks(options) && was_seen_as_file(ref)) {
+        Result<Descriptor> seen = open_file_for_reading((*directory)->descriptor(), ref.leaf.c_str());
+        if (seen.ok())
+            return std::unique_ptr<Node>(
+                std::make_unique<FileNode>(*std::move(seen), (*directory)->device(), ref, NodeKind::file));
+    }
     struct stat status = {};
     Result<Descriptor> descriptor = open_descriptor(**directory, ref, options, status);
     if (!descriptor.ok())
         return descriptor.status();
     const DeviceId device = device_of_node(**directory, status.st_dev, status.st_ino, status.st_mode);
-    return std::unique_ptr<Node>(std::make_unique<FileNode>(*std::move(descriptor), device, ref));
+    const auto kind = status.st_mode != 0 ? std::optional(to_node_kind(status.st_mode)) : std::nullopt;
+    return std::unique_ptr<Node>(std::make_unique<FileNode>(*std::move(descriptor), device, ref, kind));
 }
 
 Result<Descriptor> LinuxFileSystem::open_descriptor(const Directory& directory, const EntryRef& ref,
@@ -214,18 +222,14 @@ Result<EntryRef> LinuxFileSystem::entry_of_directory(const NodeId& id) {
     if (!found.ok())
         return found.status();
     const Directory& directory = **found;
-    const Result<std::string> leaf = directory.leaf();
-    if (!leaf.ok())
-        return leaf.status();
-    if (*leaf == ".")
-        return EntryRef{id.device, id.inode, *leaf};
-    if (volumes_.current()->rooted_at(directory.file_system_device(), directory.inode()) == nullptr) {
-        struct stat parent = {};
-        if (system_calls().fstatat(directory.descriptor(), "..", &parent, 0) != 0)
-            return Status(errno);
-        if (parent.st_dev == directory.file_system_device())
-            return EntryRef{id.device, parent.st_ino, *leaf};
-    }
+    Result<Directory::Place> place = directory.place();
+    if (!place.ok())
+        return place.status();
+    if (place->leaf == ".")
+        return EntryRef{id.device, id.inode, std::move(place->leaf)};
+    if (place->parent_device == directory.file_system_device() &&
+        volumes_.current()->rooted_at(directory.file_system_device(), directory.inode()) == nullptr)
+        return EntryRef{id.device, place->parent_inode, std::move(place->leaf)};
     // The way up leads out of the volume.
     Result<Descriptor> parent = open_directory(directory.descriptor(), "..");
     if (!parent.ok())
@@ -234,7 +238,13 @@ Result<EntryRef> LinuxFileSystem::entry_of_directory(const NodeId& id) {
     if (system_calls().fstat(parent->get(), &status) != 0)
         return Status(errno);
     const DeviceId device = volumes_.device_of_directory(parent->get(), status);
-    return EntryRef{device, cache_.adopt(*std::move(parent), device, status)->inode(), *leaf};
+    return EntryRef{device, cache_.adopt(*std::move(parent), device, status)->inode(),
+                    std::move(place->leaf)};
+}
+
+Status LinuxFileSystem::check_directory(const EntryRef& ref) {
+    const Result<Handle> directory = directory_of(ref);
+    return directory.ok() ? (*directory)->check_exists(ref.leaf.c_str()) : directory.status();
 }
 
 Result<NodeId> LinuxFileSystem::root_of(DeviceId volume) {

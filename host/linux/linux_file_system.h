@@ -14,6 +14,7 @@ class LinuxFileSystem final : public FileSystem {
     Result<EntryRef> entry_of(const std::string& path, Follow follow) override;
     Result<std::string> path_of(const EntryRef& ref) override;
     Result<EntryRef> entry_of_directory(const NodeId& directory) override;
+    Status check_directory(const EntryRef& ref) override;
     Result<NodeId> root_of(DeviceId volume) override;
 
     Result<NodeStat> stat(const EntryRef& ref) override;

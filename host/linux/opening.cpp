@@ -50,6 +50,13 @@ Result<Descriptor> open_for_reading(int directory, const char* leaf, struct stat
     return Descriptor(descriptor);
 }
 
+Result<Descriptor> open_file_for_reading(int directory, const char* leaf) {
+    const int descriptor = open_without_access_time(directory, leaf, kReadingFlags | O_NOFOLLOW);
+    if (descriptor < 0)
+        return Status(errno);
+    return Descriptor(descriptor);
+}
+
 Result<Descriptor> open_directory(int directory, const char* leaf, SymbolicLink symbolic_link) {
     const int more = O_DIRECTORY | (symbolic_link == SymbolicLink::refuse ? O_NOFOLLOW : 0);
     int descriptor = open_without_access_time(directory, leaf, kReadingFlags | more);

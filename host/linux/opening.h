@@ -14,6 +14,9 @@ namespace host {
 /// `status`, where given, receives what it was found to be just before; all zero when there is nothing.
 Result<Descriptor> open_for_reading(int directory, const char* leaf, struct stat* status = nullptr);
 
+/// The same for what is known to be a plain file: not looked at before it is opened.
+Result<Descriptor> open_file_for_reading(int directory, const char* leaf);
+
 enum class SymbolicLink { refuse, follow };
 
 /// Opens a directory for reading its entries and as a base for openat; one that may be passed through but not

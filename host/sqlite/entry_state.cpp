@@ -19,6 +19,20 @@ constexpr std::size_t kLongestComparedText = 65536;
 
 } // namespace
 
+bool says_nothing_of_the_entry(int error) {
+    switch (error) {
+    case EIO:
+    case ESTALE:
+    case ETIMEDOUT:
+    case EMFILE:
+    case ENFILE:
+    case ENOMEM:
+        return true;
+    default:
+        return false;
+    }
+}
+
 std::int64_t change_time_of(const struct stat& status) {
     return status.st_ctim.tv_sec * kSecond + status.st_ctim.tv_nsec;
 }
@@ -56,16 +70,17 @@ bool row_agrees(const IndexRow& row, const EntryState& state, const AttributeNam
 
 Status StateReader::read(int directory, DeviceId device, const char* leaf, EntryState& state) {
     state.attributes.clear();
-    if (system_calls().fstatat(directory, leaf, &state.status, AT_SYMLINK_NOFOLLOW) != 0)
-        return errno;
+    Result<Descriptor> file = open_for_reading(directory, leaf, &state.status);
+    // What this user may not read has no attributes for him.
+    if (!file)
+        return state.status.st_mode == 0 || file.error() == ENOENT || says_nothing_of_the_entry(file.error())
+                   ? file.status()
+                   : Status();
     if (!S_ISREG(state.status.st_mode) && !S_ISDIR(state.status.st_mode))
         return {};
-    Result<Descriptor> file = open_for_reading(directory, leaf);
-    if (!file)
-        return file.error() == ENOENT ? Status(ENOENT) : Status();
-    if (system_calls().fstat(file->get(), &state.status) != 0)
-        return errno;
     for (int attempt = 0; attempt < kAttempts; ++attempt) {
+        // The first time that of the name, which another file may have taken over before it was opened.
+        const ino_t inode = state.status.st_ino;
         const std::int64_t before = change_time_of(state.status);
         state.attributes.clear();
         timespec now = {};
@@ -77,11 +92,13 @@ Status StateReader::read(int directory, DeviceId device, const char* leaf, Entry
                  std::string(reinterpret_cast<const char*>(attribute.bytes.data()), attribute.bytes.size()),
                  attribute.complete});
         });
+        if (says_nothing_of_the_entry(scanned.error()))
+            return scanned;
         if (!scanned.ok())
             state.attributes.clear();
         if (system_calls().fstat(file->get(), &state.status) != 0)
             return errno;
-        if (change_time_of(state.status) == before)
+        if (change_time_of(state.status) == before && state.status.st_ino == inode)
             return {};
     }
     state.settled = false;

@@ -28,6 +28,7 @@ DirectoryCache::Handle RowWriter::find_directory(const ChangeNote& note) {
     }
     last_directory_ = note.directory;
     last_handle_ = found ? *found : nullptr;
+    last_error_ = found.status();
     return last_handle_;
 }
 
@@ -35,6 +36,7 @@ DatabaseResult RowWriter::write(std::vector<ChangeNote>& notes, const std::set<s
                                 LiveQueries& live) {
     changes_.clear();
     live_changes_.clear();
+    left_unread_ = false;
     last_directory_ = 0;
     last_handle_.reset();
     for (const ChangeNote& note : notes)
@@ -114,16 +116,15 @@ DatabaseResult RowWriter::remember_directory(std::uint64_t directory) {
             DirectoryCache::instance().find(device_, directory, DirectoryCache::Search::hints_only);
         if (!handle)
             return result;
-        const auto leaf = (*handle)->leaf();
-        struct stat parent = {};
-        if (!leaf || fstatat((*handle)->descriptor(), "..", &parent, 0) != 0)
+        const auto place = (*handle)->place();
+        if (!place)
             return result;
-        result = store_.put_directory({directory, parent.st_ino, *leaf, 0});
+        result = store_.put_directory({directory, place->parent_inode, place->leaf, 0});
         if (!succeeded(result))
             return result;
-        if (parent.st_dev != (*handle)->file_system_device() || parent.st_ino == directory)
+        if (place->parent_device != (*handle)->file_system_device() || place->parent_inode == directory)
             return result;
-        directory = parent.st_ino;
+        directory = place->parent_inode;
         if (!DirectoryCache::instance().find(device_, directory, DirectoryCache::Search::hints_only))
             return result;
     }
@@ -207,6 +208,12 @@ void RowWriter::compare_live(const ChangeNote& note, const IndexRow* old, const 
     }
 }
 
+// Hits look at the file anyway.
+DatabaseResult RowWriter::leave_as_it_is(const ChangeNote& note) {
+    left_unread_ |= note.source == ChangeNote::Source::own;
+    return DatabaseResult::done;
+}
+
 DatabaseResult RowWriter::write_note(const ChangeNote& note, const std::set<std::string>& indexed,
                                      const std::vector<std::shared_ptr<LiveQuery>>& live) {
     IndexRow old;
@@ -227,9 +234,10 @@ DatabaseResult RowWriter::write_note(const ChangeNote& note, const std::set<std:
         ++(note.source == ChangeNote::Source::own ? statistics_.reported_read : statistics_.observed_read);
         const Status read = reader_.read(directory->descriptor(), device_, note.leaf.c_str(), state);
         there = read.ok();
-        // Anything but "not there" says nothing about the entry: the row stays, hits look at the file anyway.
         if (!read.ok() && read.error() != ENOENT && read.error() != ENOTDIR)
-            return DatabaseResult::done;
+            return leave_as_it_is(note);
+    } else if (says_nothing_of_the_entry(last_error_.error())) {
+        return leave_as_it_is(note);
     }
     if (!live.empty())
         compare_live(note, old_row, there ? &state : nullptr, live);

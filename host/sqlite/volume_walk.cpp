@@ -278,11 +278,11 @@ Status VolumeIndex::look_at_directories(const std::atomic<bool>* cancelled) {
         looked_at.push_back(directory);
         for (const std::uint64_t inode : found) {
             const auto child = cache.find(device_, inode, DirectoryCache::Search::hints_only);
-            const auto leaf = child ? (*child)->leaf() : Result<std::string>(Status(ENOENT));
-            if (leaf && known.insert(inode).second)
-                directories.push_back({inode, directory.inode, *leaf, 0});
-            else if (leaf)
-                looked_at.push_back({inode, directory.inode, *leaf, 0});
+            const auto place = child ? (*child)->place() : Result<Directory::Place>(Status(ENOENT));
+            if (place && known.insert(inode).second)
+                directories.push_back({inode, directory.inode, place->leaf, 0});
+            else if (place)
+                looked_at.push_back({inode, directory.inode, place->leaf, 0});
         }
     }
     give_back_reader(std::move(reader));

@@ -1,4 +1,5 @@
 #include "host/sqlite/walk_query.h"
+#include "host/linux/seen_entry.h"
 #include "host/linux/volume_table.h"
 #include "host/sqlite/entry_state.h"
 #include <cerrno>
@@ -24,6 +25,8 @@ Status WalkQuery::next(Hit& hit) {
         hit.ref.directory = entry.directory;
         hit.ref.leaf.assign(entry.leaf);
         hit.inode = entry.inode;
+        if (entry.kind == NodeKind::file)
+            set_seen_file(hit.ref);
         if (!live_ || live_->hand_out(hit.ref, hit.inode))
             return {};
     }

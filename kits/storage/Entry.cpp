@@ -28,10 +28,7 @@ status_t PathBelow(const BDirectory* directory, const char* path, std::string& r
 
 // Whether a reference's directory is there. Whether the leaf is matters to nobody.
 status_t CheckDirectory(const entry_ref& ref) {
-    host::Result<host::NodeStat> found = host::file_system().stat(HostRef(ref));
-    if (found || found.error() != ENOENT)
-        return StatusOf(found);
-    return StatusOf(host::file_system().entry_of_directory({ref.device, ref.directory}));
+    return StatusOf(host::file_system().check_directory(HostRef(ref)));
 }
 
 } // namespace

@@ -178,18 +178,21 @@ status_t BNodeInfo::GetTrackerIcon(BBitmap* icon, icon_size size) const {
     char type[B_MIME_TYPE_LENGTH];
     if (ReadTypeAttribute(*mNode, kTypeAttribute, type) == B_OK)
         return GetTypeIcon(type, icon, size);
-    host::NodeStat stat;
-    if (status_t status = mNode->ReadStat(&stat); status != B_OK)
-        return status;
-    if (stat.kind == host::NodeKind::directory)
-        return GetTypeIcon(TypeOfDirectory(node_ref(stat.id.device, stat.id.inode)), icon, size);
-    if (stat.kind == host::NodeKind::symbolic_link)
+    host::Result<host::NodeKind> kind = mNode->HostNode()->kind();
+    if (!kind)
+        return StatusOf(kind);
+    if (*kind == host::NodeKind::directory) {
+        node_ref directory;
+        status_t status = mNode->GetNodeRef(&directory);
+        return status == B_OK ? GetTypeIcon(TypeOfDirectory(directory), icon, size) : status;
+    }
+    if (*kind == host::NodeKind::symbolic_link)
         return GetTypeIcon(kSymLinkType, icon, size);
     std::string guess = TypeOfName(mNode->mRef.name);
     if (!guess.empty())
         return GetTypeIcon(guess, icon, size);
     BMimeType sniffed;
-    if (stat.kind == host::NodeKind::file && BMimeType::GuessMimeType(&mNode->mRef, &sniffed) == B_OK)
+    if (*kind == host::NodeKind::file && BMimeType::GuessMimeType(&mNode->mRef, &sniffed) == B_OK)
         return GetTypeIcon(sniffed.Type(), icon, size);
     return GetTypeIcon(B_FILE_MIME_TYPE, icon, size);
 }

@@ -126,6 +126,7 @@ class BrindleMetaData {
     void DeleteOwnedBitmaps();
     void ReadCoverAttribute(BNode* node);
     void ReadPlayTimeAttribute(BNode* node);
+    void DeriveFromNames(const entry_ref& ref);
     void ReadFolderName(const BEntry& entry);
     void WriteCoverAttribute(BNode* node);
 };

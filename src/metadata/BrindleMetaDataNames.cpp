@@ -39,10 +39,8 @@ status_t BrindleMetaData::ReadMetaDataFromRef(entry_ref* ref) {
         mIsValid = true;
         return 0;
     }
-    if (ReadMetaFilename(ref) == -1) {
-        mIsValid = false;
-        return -1;
-    }
+    DeriveFromNames(*ref);
+    WriteMetaAttributes(&node);
     mIsValid = true;
     return 0;
 }
@@ -53,10 +51,18 @@ status_t BrindleMetaData::ReadMetaID3Tag(entry_ref*) {
 }
 
 status_t BrindleMetaData::ReadMetaFilename(entry_ref* ref) {
-    const BEntry entry(ref, false);
+    DeriveFromNames(*ref);
+    mIsValid = true;
+    BNode node(ref);
+    WriteMetaAttributes(&node);
+    return 0;
+}
+
+void BrindleMetaData::DeriveFromNames(const entry_ref& ref) {
+    const BEntry entry(&ref, false);
     char name[B_FILE_NAME_LENGTH];
     if (entry.GetName(name) != B_OK)
-        CopyText(name, ref->name);
+        CopyText(name, ref.name);
     CopyText(mFilename, name);
 
     FileNameParts parts;
@@ -72,11 +78,6 @@ status_t BrindleMetaData::ReadMetaFilename(entry_ref* ref) {
     else
         DropLeadingBlank(mArtist);
     CopyText(mSongname, parts.songname);
-
-    mIsValid = true;
-    BNode node(ref);
-    WriteMetaAttributes(&node);
-    return 0;
 }
 
 void BrindleMetaData::ReadFolderName(const BEntry& entry) {

@@ -38,7 +38,7 @@ TEST_F(DirectoryCacheTest, FindsADirectoryThatWasNeverOpened) {
     const auto found = cache_.find(device_, inode);
     ASSERT_TRUE(found.ok());
     EXPECT_EQ(*(*found)->path(), path("a/b/c"));
-    EXPECT_EQ(*(*found)->leaf(), "c");
+    EXPECT_EQ((*found)->place()->leaf, "c");
     EXPECT_EQ((*found)->device(), device_);
 }
 
@@ -86,7 +86,7 @@ TEST_F(DirectoryCacheTest, FindsADirectoryAfterItAndItsParentsWereRenamedAndMove
     const std::uint64_t inode = make("a/b/c");
     ASSERT_TRUE(cache_.open_path(path("a/b/c").c_str()).ok());
     fs::rename(path("a/b/c"), path("a/b/renamed"));
-    EXPECT_EQ(*(*cache_.find(device_, inode))->leaf(), "renamed");
+    EXPECT_EQ((*cache_.find(device_, inode))->place()->leaf, "renamed");
 
     DirectoryCache fresh(4, 64);
     make("elsewhere");
@@ -99,14 +99,14 @@ TEST_F(DirectoryCacheTest, LearnsANameAgainAtOnceAfterARename) {
     make("name0");
     const auto directory = cache_.open_path(path("name0").c_str());
     for (int i = 0; i < 50; ++i) {
-        EXPECT_EQ(*(*directory)->leaf(), "name" + std::to_string(i));
+        EXPECT_EQ((*directory)->place()->leaf, "name" + std::to_string(i));
         fs::rename(path("name" + std::to_string(i)), path("name" + std::to_string(i + 1)));
     }
     std::this_thread::sleep_for(std::chrono::milliseconds(80));
-    EXPECT_EQ(*(*directory)->leaf(), "name50");
-    EXPECT_EQ(*(*directory)->leaf(), "name50"); // remembered now
+    EXPECT_EQ((*directory)->place()->leaf, "name50");
+    EXPECT_EQ((*directory)->place()->leaf, "name50"); // remembered now
     fs::rename(path("name50"), path("last"));
-    EXPECT_EQ(*(*directory)->leaf(), "last");
+    EXPECT_EQ((*directory)->place()->leaf, "last");
 }
 
 TEST_F(DirectoryCacheTest, SaysNotThereForARemovedDirectory) {
@@ -183,7 +183,7 @@ TEST_F(DirectoryCacheTest, ServesThreadsWhileDirectoriesMove) {
                 // A search may run past a directory just as it moves; an open one is always found.
                 if (found.ok()) {
                     EXPECT_EQ((*found)->inode(), inode);
-                    (void)(*found)->leaf();
+                    (void)(*found)->place();
                 } else {
                     EXPECT_EQ(found.error(), ENOENT);
                 }
