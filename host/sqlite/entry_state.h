@@ -35,6 +35,10 @@ struct EntryState {
 
 std::int64_t change_time_of(const struct stat& status);
 
+/// The error of a call that says nothing of the entry that it was made for: the medium, the way to it or the
+/// process's means have failed. A row that could not be compared for such a reason stays as it is.
+bool says_nothing_of_the_entry(int error);
+
 /// The form in which a row keeps this attribute; its number is left to the caller. Borrows from `attribute`.
 RecordedAttribute recorded_form(const FileAttribute& attribute);
 
@@ -46,8 +50,8 @@ class StateReader {
   public:
     StateReader() : scanner_(kLongestRecordedValue + 1) {}
 
-    /// `directory` is open on `device`. ENOENT: there is no such entry. Entries that cannot have attributes
-    /// come back without.
+    /// `directory` is open on `device`. ENOENT: there is no such entry. Entries that cannot have attributes,
+    /// or whose attributes this user may not read, come back without.
     Status read(int directory, DeviceId device, const char* leaf, EntryState& state);
 
   private:

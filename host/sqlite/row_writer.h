@@ -36,6 +36,9 @@ class RowWriter {
     const std::vector<RowChange>& changes() const { return changes_; }
     std::int64_t sequence() const { return sequence_; }
 
+    /// In the last write() a change that was made through the kits could not be read from its file, because
+    /// the medium failed: its row is as it was.
+    bool left_unread() const { return left_unread_; }
     const WriterStatistics& statistics() const { return statistics_; }
 
     /// Forgets what it remembers of the database: another one has taken its place.
@@ -61,6 +64,7 @@ class RowWriter {
     void compare_live(const ChangeNote& note, const IndexRow* old, const EntryState* state,
                       const std::vector<std::shared_ptr<LiveQuery>>& live);
     DirectoryCache::Handle find_directory(const ChangeNote& note);
+    DatabaseResult leave_as_it_is(const ChangeNote& note);
 
     const DeviceId device_;
     IndexStore& store_;
@@ -70,10 +74,13 @@ class RowWriter {
     std::set<std::uint64_t> known_directories_;
     std::vector<RowChange> changes_;
     std::vector<LiveChange> live_changes_;
+    bool left_unread_ = false;
     WriterStatistics statistics_;
     std::int64_t sequence_ = 0;
     std::uint64_t last_directory_ = 0;
     DirectoryCache::Handle last_handle_;
+    /// Why there is no last_handle_.
+    Status last_error_;
 };
 
 } // namespace host

@@ -280,6 +280,9 @@ bool VolumeIndex::write_group(std::vector<ChangeNote>& group) {
         dirty_ = true;
     const DatabaseResult result = writer_.write(group, indexed_, live_);
     if (result == DatabaseResult::done) {
+        // Checked when somebody reconciles, not at once: the medium is no better then.
+        if (writer_.left_unread())
+            mark_suspect_locked();
         if (!writer_.changes().empty())
             columns_.apply(store_, writer_.changes(), writer_.sequence());
         return !lost_changes_;

@@ -10,6 +10,7 @@
 #include <chrono>
 #include <dirent.h>
 #include <fcntl.h>
+#include <unordered_map>
 #include <unordered_set>
 
 namespace host {
@@ -23,6 +24,31 @@ std::int64_t now() {
     return std::chrono::duration_cast<std::chrono::nanoseconds>(
                std::chrono::system_clock::now().time_since_epoch())
         .count();
+}
+
+// Tells the directory cache where the directories were that a walk did not meet, so that the writer finds out
+// whether they are gone or cannot be read.
+void remember_unmet(DeviceId device, const std::vector<IndexStore::KnownDirectory>& listed,
+                    const std::vector<IndexStore::KnownDirectory>& met) {
+    std::unordered_set<std::uint64_t> passed;
+    for (const auto& directory : met)
+        passed.insert(directory.inode);
+    std::unordered_map<std::uint64_t, const IndexStore::KnownDirectory*> places;
+    for (const auto* directories : {&listed, &met}) {
+        for (const auto& directory : *directories)
+            places[directory.inode] = &directory;
+    }
+    DirectoryCache& cache = DirectoryCache::instance();
+    std::unordered_set<std::uint64_t> remembered;
+    for (const auto& directory : listed) {
+        if (passed.contains(directory.inode))
+            continue;
+        // And the way to it.
+        for (auto place = places.find(directory.inode);
+             place != places.end() && remembered.insert(place->first).second;
+             place = places.find(place->second->parent))
+            cache.remember(device, place->first, place->second->parent, place->second->name);
+    }
 }
 
 } // namespace
@@ -84,15 +110,13 @@ Status VolumeIndex::walk_locked(Looking looking, const std::atomic<bool>* cancel
         return ENOTSUP;
     RowSet seen(static_cast<std::size_t>(largest) + 1);
     std::vector<IndexStore::KnownDirectory> directories;
+    std::vector<IndexStore::KnownDirectory> listed;
+    if (!succeeded(reader->all_directories(listed)))
+        return ENOTSUP;
     std::unordered_set<std::uint64_t> known;
-    {
-        std::vector<IndexStore::KnownDirectory> listed;
-        if (!succeeded(reader->all_directories(listed)))
-            return ENOTSUP;
-        for (const auto& directory : listed) {
-            if (directory.change_time != 0)
-                known.insert(directory.inode);
-        }
+    for (const auto& directory : listed) {
+        if (directory.change_time != 0)
+            known.insert(directory.inode);
     }
     AttributeNames names;
     if (keeps_rows && !succeeded(reader->attributes(names)))
@@ -161,6 +185,7 @@ Status VolumeIndex::walk_locked(Looking looking, const std::atomic<bool>* cancel
     // Not "observed": these rows may be wrong although their change times are right.
     for (const Finding& finding : findings)
         queue_.put(finding.directory, finding.leaf, ChangeNote::Source::own);
+    remember_unmet(device_, listed, directories);
     for (RowNumber id = 1; id <= largest; ++id) {
         IndexRow row;
         if (!seen.holds(id) && reader->read(id, row) == DatabaseResult::row)
