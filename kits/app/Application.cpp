@@ -4,6 +4,7 @@
 #include "MessageDelivery.h"
 #include "TokenTable.h"
 #include "host/api/directories.h"
+#include "host/api/termination.h"
 #include <MessageRunner.h>
 #include <Roster.h>
 
@@ -103,6 +104,7 @@ status_t BApplication::InitCheck() const {
 thread_id BApplication::Run() {
     if (mInitStatus != B_OK)
         return mInitStatus;
+    const auto termination = host::watch_for_termination([this] { PostMessage(B_QUIT_REQUESTED); });
     const thread_id thread = StartThread(&BApplication::ThreadEntry);
     if (thread < 0)
         return thread;

@@ -25,7 +25,8 @@ class BApplication : public BLooper {
     status_t InitCheck() const;
 
     // The application's messages are handled in a thread of their own until Quit(); this thread runs the
-    // main loop (MainLoop.h) or waits. Returns that thread's id when all is over.
+    // main loop (MainLoop.h) or waits. Returns that thread's id when all is over. Meanwhile a request of the
+    // system to end the program (SIGTERM, SIGINT, SIGHUP) becomes a B_QUIT_REQUESTED, a second one ends it.
     // From here to the end of the loop it is a running application (Roster.h), which other processes find by
     // its signature. Where it may run only once and another one runs, that one is given this one's arguments
     // and messages and brought to the front, and the answer is B_ALREADY_RUNNING at once, no hook having been

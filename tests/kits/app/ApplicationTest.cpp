@@ -9,11 +9,13 @@
 
 #include <algorithm>
 #include <condition_variable>
+#include <csignal>
 #include <filesystem>
 #include <gtest/gtest.h>
 #include <mutex>
 #include <string>
 #include <thread>
+#include <unistd.h>
 #include <vector>
 
 namespace {
@@ -51,6 +53,9 @@ class TestApplication : public BApplication {
         switch (message->what) {
         case 'work':
             Note("work");
+            break;
+        case 'term':
+            kill(getpid(), SIGTERM);
             break;
         case 'quit':
             Note("quit");
@@ -149,6 +154,13 @@ TEST_F(ApplicationTest, QuitFromInsideEndsRunAfterTheMessageAtHand) {
     application.PostMessage('work');
     application.Run();
     EXPECT_EQ(application.calls, (Calls{"ready", "quit"}));
+}
+
+TEST_F(ApplicationTest, ARequestToEndTheProgramAsksTheApplication) {
+    TestApplication application;
+    application.PostMessage('term');
+    application.Run();
+    EXPECT_EQ(application.calls, (Calls{"ready", "quit requested"}));
 }
 
 TEST_F(ApplicationTest, QuitFromAnotherThreadEndsRunBehindTheQueuedMessages) {
