@@ -72,6 +72,14 @@ DatabaseResult IndexStore::set_meta(const char* key, std::int64_t value) {
         .run();
 }
 
+DatabaseResult IndexStore::set_meta_durably(const char* key, std::int64_t value) {
+    DatabaseResult result = connection_.execute("PRAGMA synchronous = FULL");
+    if (succeeded(result))
+        result = set_meta(key, value);
+    const DatabaseResult restored = connection_.execute("PRAGMA synchronous = NORMAL");
+    return succeeded(result) ? restored : result;
+}
+
 DatabaseResult IndexStore::indices(std::vector<ListedIndex>& list) {
     list.clear();
     Statement& select = statement("SELECT attribute, type, created FROM index_list ORDER BY rowid");

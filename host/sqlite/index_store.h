@@ -55,6 +55,8 @@ class IndexStore {
 
     std::int64_t meta(const char* key, std::int64_t missing);
     DatabaseResult set_meta(const char* key, std::int64_t value);
+    /// The same, and on the disk when it returns. Outside of transactions.
+    DatabaseResult set_meta_durably(const char* key, std::int64_t value);
 
     DatabaseResult indices(std::vector<ListedIndex>& result);
     DatabaseResult add_index(const ListedIndex& index);

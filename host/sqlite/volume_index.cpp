@@ -276,7 +276,8 @@ bool VolumeIndex::write_group(std::vector<ChangeNote>& group) {
         ++losses_;
         return true;
     }
-    if (!dirty_ && succeeded(store_.set_meta("clean", 0)))
+    // A power cut may take what was written last, but not the mark that something was.
+    if (!dirty_ && succeeded(store_.set_meta_durably("clean", 0)))
         dirty_ = true;
     const DatabaseResult result = writer_.write(group, indexed_, live_);
     if (result == DatabaseResult::done) {

@@ -168,9 +168,10 @@ Status VolumeIndex::walk_locked(Looking looking, const std::atomic<bool>* cancel
                                        AT_SYMLINK_NOFOLLOW) != 0)
                 continue;
             const std::int64_t change_time = change_time_of(found_status);
-            changed = found == DatabaseResult::row
-                          ? row.inode != found_status.st_ino || row.change_time != change_time || !row.settled
-                          : change_time > walked - kClockSlack || !known.contains(entry.directory);
+            changed =
+                found == DatabaseResult::row
+                    ? row.inode != found_status.st_ino || row.change_time != change_time || !row.settled
+                    : suspect != 0 || change_time > walked - kClockSlack || !known.contains(entry.directory);
         }
         if (!changed)
             continue;

@@ -13,8 +13,9 @@
 namespace test {
 
 LoopVolume::LoopVolume(const std::string& type, int megabytes, const std::string& options,
-                       const std::string& mount_options)
-    : directory_(make_directory_with_attributes()), image_(directory_ + "/image"),
+                       const std::string& mount_options, const std::string& image_directory)
+    : directory_(make_directory_with_attributes()),
+      image_((image_directory.empty() ? directory_ : image_directory) + "/image"),
       path_(directory_ + "/mounted"), mount_options_(mount_options) {
     if (::geteuid() != 0) {
         reason_ = "mounting needs root";

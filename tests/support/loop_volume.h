@@ -9,9 +9,10 @@ namespace test {
 /// for the test to skip with. Unmounted and deleted at the end.
 class LoopVolume {
   public:
-    /// `type` is "ext4", "btrfs", "vfat" ...; `options` go to its mkfs, `mount_options` to mount.
+    /// `type` is "ext4", "btrfs", "vfat" ...; `options` go to its mkfs, `mount_options` to mount. The image
+    /// lies in `image_directory` where one is given.
     LoopVolume(const std::string& type, int megabytes, const std::string& options = "",
-               const std::string& mount_options = "");
+               const std::string& mount_options = "", const std::string& image_directory = "");
     ~LoopVolume();
     LoopVolume(const LoopVolume&) = delete;
     LoopVolume& operator=(const LoopVolume&) = delete;
