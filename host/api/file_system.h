@@ -32,7 +32,8 @@ struct OpenOptions {
 /// time.
 ///
 /// Attributes: see docs/attributes.md. Reading never needs write access and never looks at file content.
-/// Every change of an attribute is told to the volume's index after it is on the file.
+/// Every change of an attribute is told to the volume's index after it is on the file. A change by this
+/// process is read at once, one by another program at most a tenth of a millisecond late.
 class Node {
   public:
     virtual ~Node() = default;

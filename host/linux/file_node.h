@@ -20,6 +20,9 @@ class FileNode final : public Node {
     /// Tells the index when the content has been changed.
     ~FileNode() override;
 
+    /// Several attributes are going to be asked for, so they are listed before the first is read.
+    void expect_questions() { recent_.note_miss(); }
+
     Result<NodeStat> stat() override;
     Result<NodeKind> kind() override;
     Result<std::size_t> read_at(std::int64_t position, void* buffer, std::size_t size) override;

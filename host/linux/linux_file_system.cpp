@@ -104,9 +104,12 @@ Result<std::unique_ptr<Node>> LinuxFileSystem::open(const EntryRef& ref, const O
         return directory.status();
     if (only_looks(options) && was_seen_as_file(ref)) {
         Result<Descriptor> seen = open_file_for_reading((*directory)->descriptor(), ref.leaf.c_str());
-        if (seen.ok())
-            return std::unique_ptr<Node>(
-                std::make_unique<FileNode>(*std::move(seen), (*directory)->device(), ref, NodeKind::file));
+        if (seen.ok()) {
+            auto node =
+                std::make_unique<FileNode>(*std::move(seen), (*directory)->device(), ref, NodeKind::file);
+            node->expect_questions();
+            return std::unique_ptr<Node>(std::move(node));
+        }
     }
     struct stat status = {};
     Result<Descriptor> descriptor = open_descriptor(**directory, ref, options, status);

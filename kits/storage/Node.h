@@ -23,7 +23,8 @@ class Node;
 // all of them.
 //
 // Attributes: a name of at most B_ATTR_NAME_LENGTH bytes, a type code and bytes. A method of a node that is
-// not open answers B_NO_INIT, one that is given null B_BAD_VALUE.
+// not open answers B_NO_INIT, one that is given null B_BAD_VALUE. What this program changes is read at once;
+// what another program changes may be read as it was up to a tenth of a millisecond before.
 class BNode : public BStatable {
   public:
     BNode();
