@@ -18,12 +18,10 @@ class BButton : public BControl {
 
     void Draw(BRect updateRect) override;
     void AttachedToWindow() override;
-    void DetachedFromWindow() override;
     void MouseDown(BPoint where) override;
     void MouseMoved(BPoint where, uint32 code, const BMessage* dragMessage) override;
     void MouseUp(BPoint where) override;
     void KeyDown(const char* bytes, int32 numBytes) override;
-    void SetLabel(const char* label) override;
 
     // A window has one default button at most: making one ends the other's time. It is drawn with a thicker
     // frame and stays as large as it was.

@@ -86,7 +86,7 @@ void ControlLook::Separator(float left, float right, float y) {
     mView->EndLineArray();
 }
 
-void ControlLook::Label(const char* text, BRect rect, alignment align, ControlState state) {
+void ControlLook::LabelInColor(const char* text, BRect rect, alignment align, rgb_color color) {
     if (text == nullptr || *text == '\0' || !rect.IsValid()) {
         return;
     }
@@ -105,7 +105,7 @@ void ControlLook::Label(const char* text, BRect rect, alignment align, ControlSt
     } else if (align == B_ALIGN_CENTER) {
         x = rect.left + (available - width) / 2;
     }
-    mView->SetHighColor(TextColor(state));
+    mView->SetHighColor(color);
     mView->SetDrawingMode(B_OP_OVER); // mixes with whatever the label stands on
     mView->DrawString(shown.String(), BPoint(std::floor(x), Baseline(font, rect)));
     mView->SetDrawingMode(B_OP_COPY);

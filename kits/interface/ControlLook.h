@@ -63,7 +63,10 @@ class ControlLook {
 
     // A text of one line within the rectangle, in the middle of its height, cut with an ellipsis where it is
     // too wide. The view's font is used.
-    void Label(const char* text, BRect rect, alignment align, ControlState state);
+    void Label(const char* text, BRect rect, alignment align, ControlState state) {
+        LabelInColor(text, rect, align, TextColor(state));
+    }
+    void LabelInColor(const char* text, BRect rect, alignment align, rgb_color color);
     // A filled triangle in the middle of the rectangle.
     void Arrow(BRect rect, Direction direction, ControlState state);
     // A tick in the middle of the rectangle.

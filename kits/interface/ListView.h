@@ -13,9 +13,10 @@ class RowPositions;
 
 enum list_view_type { B_SINGLE_SELECTION_LIST, B_MULTIPLE_SELECTION_LIST };
 
-// Rows lie below each other, each as high as its Height() says, with one pixel between them; a row reaches
-// from 0 to the right edge of the view. The list never owns its rows and never deletes them. Indices run from
-// 0 to CountItems() - 1; a method that is given another index answers null, false or -1 and changes nothing.
+// Rows lie below each other without a gap; one of height h (rounded up) covers h + 1 pixels, as rectangles
+// do. A row reaches from 0 to the right edge of the view. The list never owns its rows and never deletes
+// them. Indices run from 0 to CountItems() - 1; a method that is given another index answers null, false or
+// -1 and changes nothing.
 //
 // Rows are selected through the list, not through BListItem::Select(). Each change of the selection calls
 // SelectionChanged() and sends the selection message; invoking (a double click, Return, Space) sends the
@@ -153,40 +154,47 @@ class BListView : public BView, public BInvoker {
     virtual void DrawItem(BListItem* item, BRect frame, bool complete = false);
 
   private:
-    // A mouse button that went down on a row.
+    // A mouse button that went down on a row and has not come up.
     struct Press {
         int32 row = -1;
         BPoint where;
         bool wasSelected = false;
+        bool dragWasOffered = false;
         // The row becomes the only selected one when the button comes up without a drag.
         bool selectsOnRelease = false;
     };
 
-    void InsertRows(int32 index, const std::vector<BListItem*>& rows);
-    BListItem* TakeRow(int32 index);
-    void RowsChanged(int32 from);
-    void UpdateRow(BListItem* item, const BFont& font);
+    void InsertRows(int32 index, const BList& rows);
+    bool RemoveRows(int32 index, int32 count);
     void UpdateAllRows();
-    void TakeExtentFromRow(int32 index);
+    void TakeHeightFromRow(int32 index);
+    void RebuildPositions();
     void InvalidateFrom(int32 index);
     void FixupScrollBar();
-    void DrawCursor();
+    BListItem* RowAt(int32 index) const;
 
+    bool HasSelection() const { return mFirstSelected <= mLastSelected; }
     bool SetSelected(int32 from, int32 to, bool selected);
     bool DeselectOutside(int32 from, int32 to);
-    void SelectionHasChanged();
+    void WidenSelectionBounds(int32 from, int32 to);
+    void TightenSelectionBounds();
     void ForgetSelectionCount() const { mCountedOrdinal = -1; }
+    void SelectionHasChanged();
+
     void PressRow(int32 row, uint32 modifiers);
+    void SelectFromAnchorTo(int32 row, bool extend);
     void MoveCursor(int32 row, uint32 modifiers);
     void SetCursor(int32 row, bool shown);
-    void ScrollToRow(int32 index);
+    int32 RowToMoveFrom() const;
+    int32 NextEnabledRow(int32 from, int32 step) const;
     int32 RowOnePageFrom(int32 row, int32 direction);
-    int32 CountShownSelection() const;
+    void ScrollToRow(int32 index);
 
     list_view_type mType = B_SINGLE_SELECTION_LIST;
     BList mItems;
     std::unique_ptr<RowPositions> mPositions;
     std::unique_ptr<BMessage> mSelectionMessage;
+    BScrollView* mScrollView = nullptr;
     // All selected rows lie between these; last < first when there are none.
     int32 mFirstSelected = 0;
     int32 mLastSelected = -1;
@@ -198,6 +206,6 @@ class BListView : public BView, public BInvoker {
     // The row that CurrentSelection() found last, so that walking through the selection is linear.
     mutable int32 mCountedOrdinal = -1;
     mutable int32 mCountedRow = -1;
-    // Where IndexOf() found its last row.
+    // Where IndexOf() found its last row; the next one mostly lies near it.
     mutable int32 mLastFound = 0;
 };

@@ -5,6 +5,7 @@
 #include "ViewHost.h"
 
 #include <Message.h>
+#include <ScrollBar.h>
 
 #include <algorithm>
 #include <string.h>
@@ -74,6 +75,11 @@ BView::BView(BMessage* archive) : BHandler(archive), mState(std::make_unique<Dra
 }
 
 BView::~BView() {
+    for (BScrollBar* const bar : {mHorizontalScrollBar, mVerticalScrollBar}) {
+        if (bar != nullptr) {
+            bar->ForgetTarget();
+        }
+    }
     RemoveSelf();
     while (!mChildren.empty()) {
         BView* const child = mChildren.back();
@@ -128,6 +134,17 @@ void BView::DetachedFromWindow() {}
 void BView::AllDetached() {}
 
 void BView::MessageReceived(BMessage* message) {
+    if (message->what == B_MOUSE_WHEEL_CHANGED &&
+        (mHorizontalScrollBar != nullptr || mVerticalScrollBar != nullptr)) {
+        float turns = 0;
+        if (mHorizontalScrollBar != nullptr && message->FindFloat("be:wheel_delta_x", &turns) == B_OK) {
+            mHorizontalScrollBar->ScrollByWheel(turns);
+        }
+        if (mVerticalScrollBar != nullptr && message->FindFloat("be:wheel_delta_y", &turns) == B_OK) {
+            mVerticalScrollBar->ScrollByWheel(turns);
+        }
+        return;
+    }
     BHandler::MessageReceived(message);
 }
 

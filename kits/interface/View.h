@@ -97,7 +97,7 @@ class BView : public BHandler {
     virtual void ResizeToPreferred();
     void ScrollBy(float dh, float dv);
     void ScrollTo(float x, float y) { ScrollTo(BPoint(x, y)); }
-    // Makes the point the left top corner of Bounds().
+    // Makes the point the left top corner of Bounds(), and tells the scroll bars.
     virtual void ScrollTo(BPoint where);
     BScrollBar* ScrollBar(orientation posture) const;
 

@@ -3,6 +3,8 @@
 
 #include "ViewHost.h"
 
+#include <ScrollBar.h>
+
 #include <cmath>
 
 BRect BView::Frame() const {
@@ -112,6 +114,12 @@ void BView::ScrollTo(BPoint where) {
     if (mHost != nullptr) {
         const BRegion visible = VisibleRegion(Covered::WithChildren);
         mHost->ContentsScrolled(this, visible, static_cast<int32>(delta.x), static_cast<int32>(delta.y));
+    }
+    if (mHorizontalScrollBar != nullptr) {
+        mHorizontalScrollBar->TargetScrolledTo(where.x);
+    }
+    if (mVerticalScrollBar != nullptr) {
+        mVerticalScrollBar->TargetScrolledTo(where.y);
     }
 }
 
