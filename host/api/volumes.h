@@ -49,7 +49,8 @@ class Volumes {
     virtual ~Volumes() = default;
 
     virtual std::vector<DeviceId> list() = 0;
-    /// ENODEV when there is no such volume (any more). Capacity and free bytes are fresh.
+    /// ENODEV when there is no such volume (any more). Capacity, free bytes and whether it knows queries are
+    /// fresh.
     virtual Result<VolumeInfo> info(DeviceId volume) = 0;
     /// The volume that answers for an absolute path: the deepest volume root at or above it.
     virtual Result<DeviceId> volume_of(const std::string& path) = 0;

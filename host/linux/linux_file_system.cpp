@@ -1,6 +1,7 @@
 #include "host/linux/linux_file_system.h"
 
 #include "host/api/index.h"
+#include "host/linux/directory_path.h"
 #include "host/linux/entry_reader.h"
 #include "host/linux/file_node.h"
 #include "host/linux/node_stat.h"
@@ -59,6 +60,26 @@ int to_open_flags(const OpenOptions& options) {
     if (options.truncate == Truncate::yes)
         flags |= O_TRUNC;
     return flags;
+}
+
+// Without /proc, or where it does not tell a path of this length, the way up is climbed.
+Result<std::string> path_of_directory(const Directory& directory) {
+    Result<std::string> path = directory.path();
+    return path.ok() ? path : path_by_climbing(directory.descriptor());
+}
+
+Result<Directory::Place> place_of_directory(const Directory& directory) {
+    Result<Directory::Place> place = directory.place();
+    if (place.ok())
+        return place;
+    const Result<std::string> path = path_by_climbing(directory.descriptor());
+    struct stat above = {};
+    if (!path.ok())
+        return path.status();
+    if (system_calls().fstatat(directory.descriptor(), "..", &above, 0) != 0)
+        return Status(errno);
+    return Directory::Place{*path == "/" ? "." : path->substr(path->rfind('/') + 1), above.st_dev,
+                            above.st_ino};
 }
 
 bool only_looks(const OpenOptions& options) {
@@ -214,7 +235,7 @@ Result<std::string> LinuxFileSystem::path_of(const EntryRef& ref) {
     const Result<Handle> directory = directory_of(ref);
     if (!directory.ok())
         return directory.status();
-    Result<std::string> path = (*directory)->path();
+    Result<std::string> path = path_of_directory(**directory);
     if (!path.ok() || ref.leaf == ".")
         return path;
     return (*path == "/" ? *path : *path + "/") + ref.leaf;
@@ -225,7 +246,7 @@ Result<EntryRef> LinuxFileSystem::entry_of_directory(const NodeId& id) {
     if (!found.ok())
         return found.status();
     const Directory& directory = **found;
-    Result<Directory::Place> place = directory.place();
+    Result<Directory::Place> place = place_of_directory(directory);
     if (!place.ok())
         return place.status();
     if (place->leaf == ".")

@@ -6,7 +6,11 @@
 #include <cstdint>
 #include <fstream>
 #include <iterator>
+#include <linux/magic.h>
 #include <optional>
+#include <sys/stat.h>
+#include <sys/statfs.h>
+#include <sys/statvfs.h>
 #include <sys/sysmacros.h>
 
 namespace host {
@@ -85,6 +89,48 @@ std::optional<MountEntry> parse_line(std::string_view line) {
     return entry;
 }
 
+std::string_view name_of_type(unsigned long magic) {
+    switch (magic) {
+    case EXT4_SUPER_MAGIC:
+        return "ext4";
+    case BTRFS_SUPER_MAGIC:
+        return "btrfs";
+    case XFS_SUPER_MAGIC:
+        return "xfs";
+    case TMPFS_MAGIC:
+        return "tmpfs";
+    case RAMFS_MAGIC:
+        return "ramfs";
+    case OVERLAYFS_SUPER_MAGIC:
+        return "overlay";
+    case NFS_SUPER_MAGIC:
+        return "nfs";
+    default:
+        return "unknown";
+    }
+}
+
+MountEntry make_root_entry(const std::vector<MountEntry>& others) {
+    MountEntry root;
+    root.root = "/";
+    root.mount_point = "/";
+    struct stat status = {};
+    struct statfs file_system = {};
+    if (::stat("/", &status) == 0)
+        root.device = status.st_dev;
+    if (::statfs("/", &file_system) == 0) {
+        root.file_system = name_of_type(static_cast<unsigned long>(file_system.f_type));
+        root.read_only = (file_system.f_flags & ST_RDONLY) != 0;
+    }
+    // A part of the same file system may be mounted where it is seen.
+    const auto same = std::ranges::find(others, root.device, &MountEntry::device);
+    if (same != others.end()) {
+        root.file_system = same->file_system;
+        root.source = same->source;
+    }
+    return root;
+}
+
 template <std::size_t size>
 bool contains(const std::array<std::string_view, size>& names, std::string_view name) {
     return std::ranges::find(names, name) != names.end();
@@ -116,7 +162,16 @@ std::vector<MountEntry> parse_mount_table(std::string_view text) {
 
 std::vector<MountEntry> read_mount_table() {
     std::ifstream file("/proc/self/mountinfo", std::ios::binary);
-    return parse_mount_table(std::string(std::istreambuf_iterator<char>(file), {}));
+    return mounts_with_root(std::string(std::istreambuf_iterator<char>(file), {}));
+}
+
+std::vector<MountEntry> mounts_with_root(std::string_view text) {
+    std::vector<MountEntry> entries = parse_mount_table(text);
+    const bool has_root = std::ranges::find(entries, "/", &MountEntry::mount_point) != entries.end();
+    // First, so that of several mounts of its file system it is the one that stands for it.
+    if (!has_root)
+        entries.insert(entries.begin(), make_root_entry(entries));
+    return entries;
 }
 
 bool is_memory_file_system(std::string_view type) {

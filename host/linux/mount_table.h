@@ -20,8 +20,11 @@ struct MountEntry {
 /// Parses the text of a mountinfo file. Lines that are not understood are passed over.
 std::vector<MountEntry> parse_mount_table(std::string_view text);
 
-/// Mounts of this process as they are now; empty where the system does not tell.
+/// Mounts of this process as they are now. There is always one at "/", made up where the table has none: a
+/// process whose root was changed may see no mount point there, and without /proc it sees none at all.
 std::vector<MountEntry> read_mount_table();
+/// The same from a table's text.
+std::vector<MountEntry> mounts_with_root(std::string_view text);
 
 /// A file system whose files lie on a disk, a medium or another machine: none that the kernel makes up, that
 /// packages a program (squashfs), or that stacks on others (overlay, but the root may be one).

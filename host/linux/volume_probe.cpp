@@ -1,10 +1,10 @@
 #include "host/linux/volume_probe.h"
 
-#include "host/api/directories.h"
 #include "host/linux/descriptor.h"
 #include "host/linux/opening.h"
 #include "host/linux/system_calls.h"
 #include "host/linux/volume_table.h"
+#include "host/sqlite/index_files.h"
 #include <cerrno>
 #include <climits>
 #include <cstdio>
@@ -121,7 +121,7 @@ std::optional<Volume> probe(const std::string& root_path, const MountEntry& moun
     info.persistent = !is_memory_file_system(mount.file_system);
     info.shared = is_network_file_system(mount.file_system);
     info.knows_attributes = knows_attributes(root->get());
-    info.knows_queries = info.knows_attributes && can_hold_index();
+    info.knows_queries = info.knows_attributes && IndexFiles(volume.stable_key).can_be_kept();
     info.name = label_by_ioctl(root->get());
     if (info.name.empty())
         info.name = label_by_links(info.device_path);
@@ -183,11 +183,6 @@ bool knows_attributes(int root) {
                                 : errno == ENODATA; // removed by another program's probe
     (void)system_calls().fremovexattr(root, kProbe);
     return given_back;
-}
-
-bool can_hold_index() {
-    const std::string directory = data_directory();
-    return make_directories(directory).ok() && ::access(directory.c_str(), W_OK | X_OK) == 0;
 }
 
 } // namespace host

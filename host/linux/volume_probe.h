@@ -24,7 +24,4 @@ dev_t mount_point_device(const MountEntry& mount);
 /// such attribute".
 bool knows_attributes(int root);
 
-/// The user's data directory exists, or can be made, and may be written to.
-bool can_hold_index();
-
 } // namespace host

@@ -3,11 +3,13 @@
 #include "host/api/directories.h"
 #include "host/linux/declared_volumes.h"
 #include "host/linux/directory_cache.h"
+#include "host/linux/directory_path.h"
 #include "host/linux/mount_table.h"
 #include "host/linux/opening.h"
 #include "host/linux/system_calls.h"
 #include "host/linux/volume_probe.h"
 #include "host/linux/volume_watcher.h"
+#include "host/sqlite/index_files.h"
 #include <algorithm>
 #include <cerrno>
 #include <cstdlib>
@@ -159,12 +161,14 @@ std::shared_ptr<const VolumeSnapshot> VolumeTable::refresh() {
             std::vector<Volume> volumes = find_volumes(sources_->declared, mounts);
             std::vector<UnlistedMount> unlisted = find_unlisted(volumes, mounts);
             snapshot_ = std::make_shared<const VolumeSnapshot>(std::move(volumes), std::move(unlisted));
+            generation_.fetch_add(1, std::memory_order_release);
         }
         after = snapshot_;
     }
     if (after != before) {
         for (const Volume& volume : before->volumes()) {
-            if (after->find(volume.info.id) == nullptr)
+            const Volume* now = after->find(volume.info.id);
+            if (now == nullptr || now->stable_key != volume.stable_key)
                 DirectoryCache::instance().forget(volume.info.id);
         }
     }
@@ -184,6 +188,7 @@ Result<VolumeInfo> VolumeTable::info(DeviceId id) {
     if (volume == nullptr)
         return Status(ENODEV);
     VolumeInfo info = volume->info;
+    info.knows_queries = info.knows_attributes && IndexFiles(volume->stable_key).can_be_kept();
     struct statvfs status = {};
     if (::statvfs(info.root.c_str(), &status) == 0) {
         const auto unit = static_cast<std::int64_t>(status.f_frsize);
@@ -253,12 +258,18 @@ DeviceId VolumeTable::device_of_directory(int descriptor, const struct stat& sta
         return rooted->info.id;
     if (!snapshot->has_declared(status.st_dev))
         return status.st_dev;
-    char path[4096];
+    std::string path(4096, '\0');
     const std::string link = "/proc/self/fd/" + std::to_string(descriptor);
-    const ssize_t length = system_calls().readlinkat(AT_FDCWD, link.c_str(), path, sizeof(path));
-    if (length <= 0)
-        return status.st_dev;
-    const Volume* volume = snapshot->above({path, static_cast<std::size_t>(length)}, status.st_dev);
+    const ssize_t length = system_calls().readlinkat(AT_FDCWD, link.c_str(), path.data(), path.size());
+    if (length > 0) {
+        path.resize(static_cast<std::size_t>(length));
+    } else {
+        Result<std::string> climbed = path_by_climbing(descriptor);
+        if (!climbed.ok())
+            return status.st_dev;
+        path = *std::move(climbed);
+    }
+    const Volume* volume = snapshot->above(path, status.st_dev);
     return volume != nullptr ? volume->info.id : status.st_dev;
 }
 

@@ -4,6 +4,8 @@
 #include "host/api/volumes.h"
 #include "host/linux/descriptor.h"
 #include "host/linux/volume_snapshot.h"
+#include <atomic>
+#include <cstdint>
 #include <memory>
 #include <string>
 #include <sys/stat.h>
@@ -32,6 +34,9 @@ class VolumeTable final : public Volumes {
     /// After looking again where something may have changed. Never null.
     std::shared_ptr<const VolumeSnapshot> refresh();
 
+    /// Moves whenever current() begins to answer with another snapshot. Costs next to nothing.
+    std::uint64_t generation() const { return generation_.load(std::memory_order_acquire); }
+
     /// The root directory, newly opened and verified to be the one that the table knows. ENODEV when the
     /// volume is gone.
     Result<Descriptor> open_root(DeviceId volume);
@@ -52,6 +57,7 @@ class VolumeTable final : public Volumes {
     Mutex mutex_;
     std::unique_ptr<Sources> sources_ GUARDED_BY(mutex_);
     std::shared_ptr<const VolumeSnapshot> snapshot_ GUARDED_BY(mutex_);
+    std::atomic<std::uint64_t> generation_{0};
     const std::unique_ptr<VolumeWatcher> watcher_;
 };
 

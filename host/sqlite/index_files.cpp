@@ -18,6 +18,25 @@ bool IndexFiles::exist() const {
     return access(database_.c_str(), F_OK) == 0 || access(list_.c_str(), F_OK) == 0;
 }
 
+bool IndexFiles::can_be_kept() const {
+    // The directory itself is made with the first index.
+    const std::string above = data_directory();
+    if (!make_directories(above).ok())
+        return false;
+    struct stat status = {};
+    const bool made = stat(directory_.c_str(), &status) == 0;
+    if (made ? !S_ISDIR(status.st_mode) : errno != ENOENT)
+        return false;
+    if (access((made ? directory_ : above).c_str(), W_OK | X_OK) != 0)
+        return false;
+    for (const std::string& file : {database_, list_, slots_}) {
+        const bool there = stat(file.c_str(), &status) == 0;
+        if (there ? !S_ISREG(status.st_mode) || access(file.c_str(), R_OK | W_OK) != 0 : errno != ENOENT)
+            return false;
+    }
+    return true;
+}
+
 Status IndexFiles::make_directory() const {
     return make_directories(directory_);
 }

@@ -17,6 +17,8 @@ class IndexFiles {
     const std::string& slots() const { return slots_; }
 
     bool exist() const;
+    /// The files are there and may be written, or can be made: nothing that is no file is in their way.
+    bool can_be_kept() const;
     Status make_directory() const;
     /// Deletes the database; the list of indices stays.
     void discard_database() const;

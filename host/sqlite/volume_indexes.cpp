@@ -3,6 +3,7 @@
 #include "host/sqlite/index_query.h"
 #include "host/sqlite/walk_query.h"
 #include <cerrno>
+#include <utility>
 
 namespace host {
 
@@ -10,8 +11,29 @@ VolumeIndexes::~VolumeIndexes() {
     shut_down();
 }
 
+std::vector<std::shared_ptr<VolumeIndex>> VolumeIndexes::take_replaced_locked() {
+    std::vector<std::shared_ptr<VolumeIndex>> replaced;
+    const std::uint64_t generation = VolumeTable::instance().generation();
+    if (generation == std::exchange(generation_, generation))
+        return replaced;
+    const auto volumes = VolumeTable::instance().current();
+    for (auto index = indexes_.begin(); index != indexes_.end();) {
+        const Volume* volume = volumes->find(index->first);
+        if (volume != nullptr && volume->stable_key == index->second->stable_key()) {
+            ++index;
+            continue;
+        }
+        replaced.push_back(std::move(index->second));
+        index = indexes_.erase(index);
+    }
+    return replaced;
+}
+
 std::shared_ptr<VolumeIndex> VolumeIndexes::of(DeviceId device) {
+    // Their end waits for their threads: after the lock.
+    std::vector<std::shared_ptr<VolumeIndex>> replaced;
     MutexLock lock(mutex_);
+    replaced = take_replaced_locked();
     const auto found = indexes_.find(device);
     if (found != indexes_.end())
         return found->second;
@@ -21,7 +43,7 @@ std::shared_ptr<VolumeIndex> VolumeIndexes::of(DeviceId device) {
         volumes = VolumeTable::instance().refresh();
         volume = volumes->find(device);
     }
-    if (volume == nullptr || !volume->info.knows_queries)
+    if (volume == nullptr || !volume->info.knows_attributes || !IndexFiles(volume->stable_key).can_be_kept())
         return nullptr;
     return indexes_[device] = std::make_shared<VolumeIndex>(device, volume->stable_key);
 }

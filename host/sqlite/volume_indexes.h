@@ -5,9 +5,10 @@
 #include "host/sqlite/mount_follower.h"
 #include "host/sqlite/volume_index.h"
 #include <atomic>
+#include <cstdint>
 #include <map>
 #include <memory>
-#include <thread>
+#include <vector>
 
 namespace host {
 
@@ -33,12 +34,16 @@ class VolumeIndexes final : public Indexes {
     std::shared_ptr<VolumeIndex> of(DeviceId volume);
 
   private:
+    /// Takes out the indexes of volumes that have gone, or whose number is another volume's by now.
+    std::vector<std::shared_ptr<VolumeIndex>> take_replaced_locked() REQUIRES(mutex_);
     void volume_came(DeviceId volume);
     void volume_went(DeviceId volume);
 
     std::atomic<bool> following_{false};
     Mutex mutex_;
     std::map<DeviceId, std::shared_ptr<VolumeIndex>> indexes_ GUARDED_BY(mutex_);
+    /// VolumeTable::generation() that indexes_ was compared with last.
+    std::uint64_t generation_ GUARDED_BY(mutex_) = 0;
     std::unique_ptr<MountFollower> mounts_ GUARDED_BY(mutex_);
 };
 

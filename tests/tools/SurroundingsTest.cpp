@@ -79,6 +79,41 @@ TEST_F(Surroundings, ASearchThatNoVolumeCanAnswerIsAFailure) {
     }
 }
 
+TEST_F(Surroundings, AnIndexThatCannotBeKeptIsSaidToBeSo) {
+    Touch("Oak - Leaf.mp3");
+    const std::string data = environment.home() + "/.local/share/bekits";
+    std::filesystem::create_directories(data);
+    std::ofstream(data + "/index") << "in the way";
+
+    for (const char* search : {"find Leaf", "query 'Audio:Songname==Leaf'"}) {
+        const auto result = Shell("\"$0\" " + std::string(search));
+        EXPECT_EQ(result.status, 1) << search;
+        EXPECT_EQ(result.output, "") << search;
+        EXPECT_EQ(result.errors, "quirnelctl: no volume here answers queries\n") << search;
+    }
+    const auto result = Shell("\"$0\" index '" + environment.volume() + "'");
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.errors, "quirnelctl: " + environment.volume() + ": this volume answers no queries\n");
+}
+
+TEST_F(Surroundings, SongsAreFoundWhosePathIsLongerThanTheSystemTakesAtOnce) {
+    const std::string leaf(200, 'd');
+    std::string path = environment.volume();
+    std::filesystem::current_path(path);
+    for (int i = 0; i < 25; ++i) {
+        std::filesystem::create_directory(leaf);
+        std::filesystem::current_path(leaf);
+        path += "/" + leaf;
+    }
+    std::ofstream("Oak - Leaf.mp3") << "sound";
+    std::filesystem::current_path("/");
+
+    ASSERT_EQ(Shell("\"$0\" index").status, 0);
+    const auto found = Shell("\"$0\" find Leaf");
+    EXPECT_EQ(found.status, 0) << found.errors;
+    EXPECT_EQ(found.output, path + "/Oak - Leaf.mp3\n");
+}
+
 TEST_F(Surroundings, AVolumeThatIsNamedTwiceIsIndexedOnce) {
     Touch("Oak - Leaf.mp3");
     const auto result = Shell("\"$0\" index '" + environment.volume() + "' '" + environment.volume() + "/.'");

@@ -1,6 +1,7 @@
 #include "host/linux/mount_table.h"
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <sys/sysmacros.h>
 
 namespace host {
@@ -71,6 +72,21 @@ TEST(MountTable, KeepsTheRootEvenWhenItIsAnOverlay) {
     };
 
     EXPECT_EQ(mount_points(select_storage_mounts(entries, no_directory)), (std::vector<std::string>{"/"}));
+}
+
+TEST(MountTable, HasARootThoughTheSystemTellsOfNone) {
+    struct stat status = {};
+    ASSERT_EQ(::stat("/", &status), 0);
+
+    const auto none = mounts_with_root("");
+    ASSERT_EQ(none.size(), 1u);
+    EXPECT_EQ(none[0].mount_point, "/");
+    EXPECT_EQ(none[0].device, status.st_dev);
+    EXPECT_FALSE(none[0].file_system.empty());
+
+    const auto elsewhere = mounts_with_root("2 1 0:50 / /data rw - overlay overlay rw\n");
+    EXPECT_EQ(mount_points(elsewhere), (std::vector<std::string>{"/", "/data"}));
+    EXPECT_EQ(mounts_with_root(kLaptop).size(), 13u);
 }
 
 TEST(MountTable, LeavesOutWhatAnotherMountHides) {

@@ -1,5 +1,6 @@
 // Volumes that go away while they are walked, queried and followed, and come back.
 
+#include "host/sqlite/volume_indexes.h"
 #include "index_fixture.h"
 #include "tests/support/loop_volume.h"
 #include <cstdlib>
@@ -65,13 +66,18 @@ class UnmountTest : public ::testing::Test {
     void expect_usable_again() {
         ASSERT_TRUE(volume_.mount()) << volume_.reason();
         device_ = volumes().list().front();
-        const auto query = indexes().query(device_, predicate("A", "x"), nullptr);
-        ASSERT_TRUE(query.ok()) << query.error();
+        EXPECT_EQ(hits_on(device_, "x"), kFiles);
+    }
+    static int hits_on(DeviceId device, const char* text) {
+        const auto query = indexes().query(device, predicate("A", text), nullptr);
+        EXPECT_TRUE(query.ok()) << query.error();
         RunningQuery::Hit hit;
         int hits = 0;
-        while ((*query)->next(hit).ok())
+        while (query.ok() && (*query)->next(hit).ok()) {
+            EXPECT_EQ(hit.ref.device, device);
             ++hits;
-        EXPECT_EQ(hits, kFiles);
+        }
+        return hits;
     }
 
     test::LoopVolume volume_{"ext4", 32};
@@ -129,6 +135,50 @@ TEST_F(UnmountTest, RebuildEndsWithNoDeviceAndKeepsTheRows) {
     EXPECT_TRUE(detached);
     EXPECT_EQ(rebuilt.error(), ENODEV);
     expect_usable_again();
+}
+
+TEST_F(UnmountTest, MountedUnderAnotherNumberItKeepsItsIndexAndItsNumberIsTheOthers) {
+    const DeviceId old_device = device_;
+    const std::string key = VolumeTable::instance().current()->find(device_)->stable_key;
+    const auto old_ref = file_system().entry_of(volume_.path() + "/d0/0", Follow::no);
+    ASSERT_TRUE(old_ref.ok());
+    ASSERT_TRUE(volume_.unmount() || (DirectoryCache::instance().clear(), volume_.unmount()))
+        << volume_.reason();
+    // Takes the loop device that has become free, and with it the number.
+    test::LoopVolume other("ext4", 32);
+    ASSERT_TRUE(other.mounted()) << other.reason();
+    ASSERT_TRUE(volume_.mount()) << volume_.reason();
+    setenv("BEKITS_VOLUMES", (volume_.path() + ":" + other.path()).c_str(), 1);
+    const auto list = volumes().list();
+    ASSERT_EQ(list.size(), 2U);
+    device_ = list[0];
+    if (list[1] != old_device)
+        GTEST_SKIP() << "the system gave the other volume another number";
+
+    // The index is the same one, and its rows are good as they are.
+    EXPECT_NE(device_, old_device);
+    EXPECT_EQ(VolumeTable::instance().current()->find(device_)->stable_key, key);
+    EXPECT_EQ(hits_on(device_, "x"), kFiles);
+    const WriterStatistics statistics = dynamic_cast<VolumeIndexes&>(indexes()).of(device_)->statistics();
+    EXPECT_EQ(statistics.reported_read + statistics.observed_read, 0U);
+    const auto ref = file_system().entry_of(volume_.path() + "/d0/0", Follow::no);
+    ASSERT_TRUE(ref.ok());
+    EXPECT_EQ(ref->device, device_);
+    EXPECT_EQ(ref->directory, old_ref->directory);
+    EXPECT_TRUE(file_system().open(*ref, {}).ok());
+
+    // The old number means the other volume now, which has neither that file nor an index.
+    EXPECT_EQ(file_system().open(*old_ref, {}).error(), ENOENT);
+    EXPECT_EQ(indexes().list(old_device)->size(), 3U);
+    EXPECT_TRUE(indexes().create(old_device, "A", kText).ok());
+    std::ofstream(other.path() + "/alone") << "content";
+    const std::string value = std::string("CSTRx") + '\0';
+    ASSERT_EQ(setxattr((other.path() + "/alone").c_str(), "user.be.A", value.data(), value.size(), 0), 0);
+    ASSERT_TRUE(indexes().reconcile(old_device, Indexes::Depth::thorough, nullptr).ok());
+    EXPECT_EQ(hits_on(old_device, "x"), 1);
+    EXPECT_EQ(hits_on(device_, "x"), kFiles);
+    indexes().shut_down();
+    DirectoryCache::instance().clear();
 }
 
 TEST_F(UnmountTest, VolumeMountedLaterIsFollowed) {
