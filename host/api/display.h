@@ -303,9 +303,6 @@ class WindowPeer {
     virtual void wait_for_present() = 0;
     // The window disappears, its listener is let go. Everything else is without effect afterwards.
     virtual void close() = 0;
-
-    // Device pixels for one logical pixel, as last told to the listener.
-    virtual double scale() const = 0;
 };
 
 // The window is hidden at first. Without a display it is never seen and its listener is never called.

@@ -105,14 +105,18 @@ thread_id BApplication::Run() {
     if (mInitStatus != B_OK)
         return mInitStatus;
     const auto termination = host::watch_for_termination([this] { PostMessage(B_QUIT_REQUESTED); });
+    const auto endUnless = [](bool works) {
+        if (works)
+            return;
+        std::fflush(nullptr);
+        // Other threads may be in the middle of anything, so nothing is torn down around them.
+        std::_Exit(EXIT_FAILURE);
+    };
+    endUnless(sMainLoop == nullptr || sMainLoop->Prepare());
     const thread_id thread = StartThread(&BApplication::ThreadEntry);
     if (thread < 0)
         return thread;
-    if (sMainLoop != nullptr && !sMainLoop->Run()) {
-        std::fflush(nullptr);
-        // The looper thread may be in the middle of anything, so nothing is torn down around it.
-        std::_Exit(EXIT_FAILURE);
-    }
+    endUnless(sMainLoop == nullptr || sMainLoop->Run());
     wait_for_thread(thread, nullptr);
     return thread;
 }

@@ -96,6 +96,9 @@ class BLooper : public BHandler {
     // Ends Loop() after the message at hand.
     void EndLoop() { mTerminating = true; }
     bool IsRunning() const { return mRunCalled; }
+    // Who gets a message that was found to be for `target`; asked before the filters. Loopers that stand for
+    // many handlers, as a window for its views, choose here. Null drops the message.
+    virtual BHandler* HandlerFor(BMessage* message, BHandler* target);
     // Starts `entry(this)` as the looper's thread and gives up the constructor's lock.
     thread_id StartThread(thread_func entry);
 

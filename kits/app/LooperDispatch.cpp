@@ -23,13 +23,21 @@ void BLooper::Loop() {
         if (handler != nullptr && current->HasSpecifiers())
             handler = ResolveTarget(current, handler);
         if (handler != nullptr)
+            handler = HandlerFor(current, handler);
+        if (handler != nullptr)
             handler = Filtered(current, handler);
         if (handler != nullptr && handler->Looper() == this)
             DispatchMessage(current, handler);
         message = std::move(mCurrentMessage);
         ends = mTerminating;
-        state->lock.Unlock();
+        // A handler that has locked once too often shall not lock everybody else out for good.
+        while (state->lock.IsOwner())
+            state->lock.Unlock();
     }
+}
+
+BHandler* BLooper::HandlerFor(BMessage* /*message*/, BHandler* target) {
+    return target;
 }
 
 // The handler that the message was sent to, or null when it has gone or moved to another looper meanwhile.

@@ -68,6 +68,11 @@ void MessageDelivery::SetTarget(BMessage& message, int32 token, bool preferred) 
     message.mDelivery.target = {ThisTeam(), token, preferred};
 }
 
+void MessageDelivery::SetReplyTo(BMessage& message, const MessengerAddress& replyTo) {
+    message.mDelivery.delivered = true;
+    message.mDelivery.replyTo = ReplyAddress(replyTo);
+}
+
 void MessageDelivery::MarkDropped(BMessage& message, BPoint where, BPoint offset) {
     message.mDelivery.dropped = true;
     message.mDelivery.dropPoint = where;

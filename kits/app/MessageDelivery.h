@@ -38,6 +38,8 @@ class MessageDelivery {
     // Whom a queued message is for.
     static const MessengerAddress& TargetOf(const BMessage& message) { return message.mDelivery.target; }
     static void SetTarget(BMessage& message, int32 token, bool preferred);
+    // Makes it a delivered message whose replies go there, or without an address to the application.
+    static void SetReplyTo(BMessage& message, const MessengerAddress& replyTo);
     // Makes it a message that was dropped there, see BMessage::DropPoint().
     static void MarkDropped(BMessage& message, BPoint where, BPoint offset);
 

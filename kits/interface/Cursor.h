@@ -62,6 +62,3 @@ class BCursor : public BArchivable {
 
 extern const BCursor* B_CURSOR_SYSTEM_DEFAULT;
 extern const BCursor* B_CURSOR_I_BEAM;
-// In the form of the first constructor.
-extern const unsigned char B_HAND_CURSOR[68];
-extern const unsigned char B_I_BEAM_CURSOR[68];

@@ -226,7 +226,14 @@ void BView::MouseDown(BPoint /*where*/) {}
 void BView::MouseUp(BPoint /*where*/) {}
 void BView::MouseMoved(BPoint /*where*/, uint32 /*code*/, const BMessage* /*dragMessage*/) {}
 void BView::WindowActivated(bool /*active*/) {}
-void BView::KeyDown(const char* /*bytes*/, int32 /*numBytes*/) {}
+
+void BView::KeyDown(const char* bytes, int32 numBytes) {
+    if (mHost != nullptr) {
+        // Nobody else is asked when the host has no use for it either.
+        (void)mHost->UnusedKey(this, bytes, numBytes);
+    }
+}
+
 void BView::KeyUp(const char* /*bytes*/, int32 /*numBytes*/) {}
 void BView::Pulse() {}
 void BView::FrameMoved(BPoint /*newPosition*/) {}
@@ -262,6 +269,9 @@ bool BView::IsHidden(const BView* lookingFrom) const {
 
 void BView::SetFlags(uint32 flags) {
     mFlags = flags;
+    if (mHost != nullptr) {
+        mHost->ViewFlagsChanged(this);
+    }
 }
 
 void BView::SetResizingMode(uint32 mode) {

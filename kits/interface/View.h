@@ -61,7 +61,8 @@ class BView : public BHandler {
     BView* ChildAt(int32 index) const;
     BView* NextSibling() const;
     BView* PreviousSibling() const;
-    BView* Parent() const { return mParent; }
+    // Null for a window's or bitmap's topmost views.
+    BView* Parent() const;
     // This view or the first below it of that name.
     BView* FindView(const char* name) const;
 
@@ -280,10 +281,6 @@ class BView : public BHandler {
     void DragMessage(BMessage* message, BBitmap* picture, BPoint offset, BHandler* replyTo = nullptr);
     void DragMessage(BMessage* message, BBitmap* picture, drawing_mode mode, BPoint offset,
                      BHandler* replyTo = nullptr);
-    // Draws an outline that follows the pointer while a button is held: as a whole, or with its left top
-    // corner where `startRect` has it.
-    void BeginRectTracking(BRect startRect, uint32 how = B_TRACK_WHOLE_RECT);
-    void EndRectTracking();
 
     // For the kit's own use, by what views are attached to. The host calls them for its topmost views alone.
     ViewHost* Host() const { return mHost; }

@@ -3,8 +3,12 @@
 
 #include "PixelSurface.h"
 
+#include <Messenger.h>
 #include <Region.h>
 
+class BBitmap;
+class BCursor;
+class BMessage;
 class BView;
 class BWindow;
 
@@ -38,6 +42,10 @@ class ViewHost {
     virtual void ContentsScrolled(BView* view, const BRegion& region, int32 /*dx*/, int32 /*dy*/) {
         Invalidate(view, region);
     }
+    // The view that the others lie in and that they do not know as their parent; null where there is none.
+    virtual const BView* RootView() const { return nullptr; }
+    // Called when the view has got the host, before its own hook is; a parent before its children.
+    virtual void ViewAdded(BView* /*view*/) {}
     // Called before the view loses the host, for it and for each view below it.
     virtual void ViewRemoved(BView* /*view*/) {}
 
@@ -50,4 +58,22 @@ class ViewHost {
     virtual void SetFocus(BView* /*view*/, bool /*focus*/) {}
     virtual status_t SetMouseEventMask(BView* view, uint32 mask, uint32 options);
     virtual void EventMaskChanged(BView* /*view*/) {}
+    virtual void ViewFlagsChanged(BView* /*view*/) {}
+    // A key that no view had a use for, in the end. True when the host has.
+    virtual bool UnusedKey(BView* /*view*/, const char* /*bytes*/, int32 /*numBytes*/) { return false; }
+    // Where the focus view's text caret stands, in its coordinates, for input methods that open windows
+    // there.
+    virtual void SetTextCaret(BView* /*view*/, BRect /*caret*/) {}
+    // Null takes the view's cursor away.
+    virtual void SetViewCursor(BView* /*view*/, const BCursor* /*cursor*/) {}
+
+    struct DragStart {
+        const BMessage* message = nullptr;
+        BRect outline;
+        const BBitmap* picture = nullptr; // in the place of the outline
+        BPoint offset;                    // of the pointer in the outline or picture
+        BMessenger replyTo;
+    };
+    // Borrows everything for the call.
+    virtual void StartDrag(const DragStart& /*drag*/) {}
 };

@@ -22,6 +22,10 @@ BWindow* BView::Window() const {
     return mHost == nullptr ? nullptr : mHost->Window();
 }
 
+BView* BView::Parent() const {
+    return mHost != nullptr && mParent == mHost->RootView() ? nullptr : mParent;
+}
+
 void BView::AttachToHost(ViewHost* host) {
     AttachTree(host);
     AnnounceAttached();
@@ -36,6 +40,7 @@ void BView::DetachFromHost() {
 void BView::AttachTree(ViewHost* host) {
     mHost = host;
     mVisibleKnown = false;
+    mHost->ViewAdded(this);
     for (BView* child : mChildren) {
         child->AttachTree(host);
     }

@@ -223,7 +223,17 @@ class BWindow : public BLooper {
     WindowHost* Host() const { return mHost.get(); }
 
   private:
+    BHandler* HandlerFor(BMessage* message, BHandler* target) override;
     void Initialise(BRect frame, const char* title, window_look look, window_feel feel, uint32 flags);
+    void DispatchOwn(BMessage* message, BHandler* handler);
+    void TakeFrame();
+    void TellFrame();
+    void SetFrame(BRect frame);
 
     std::unique_ptr<WindowHost> mHost;
+    int32 mShowLevel = 0;
+    bool mMinimized = false;
+    bool mActive = false;
+    // What FrameMoved() and FrameResized() were last called for.
+    BRect mToldFrame;
 };

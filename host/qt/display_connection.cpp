@@ -1,0 +1,120 @@
+// The connection to the display, and the loop that serves it.
+#include "gui_application.h"
+#include "main_thread.h"
+#include "screen_list.h"
+#include "screen_window.h"
+
+#include "host/api/display.h"
+#include "host/api/threads.h"
+
+#include <QGuiApplication>
+#include <QSessionManager>
+#include <QStyleHints>
+
+#include <atomic>
+#include <cstdio>
+#include <cstdlib>
+
+namespace host {
+
+namespace {
+
+std::atomic<bool> connected{false};
+std::atomic<bool> loop_to_end{false};
+std::function<void()>& quit_handler() {
+    static auto* const handler = new std::function<void()>;
+    return *handler;
+}
+
+bool is_set(const char* variable) {
+    const char* const value = std::getenv(variable);
+    return value != nullptr && value[0] != '\0';
+}
+
+bool has_display() {
+    return is_set("DISPLAY") || is_set("WAYLAND_DISPLAY") || is_set("QT_QPA_PLATFORM");
+}
+
+// Qt ends the process when its platform does not answer. It shall say so as we would, and not leave a core.
+void end_without_display(QtMsgType type, const QMessageLogContext& /*context*/, const QString& text) {
+    if (type == QtFatalMsg) {
+        const char* const display = std::getenv("DISPLAY");
+        const char* const wayland = std::getenv("WAYLAND_DISPLAY");
+        std::fprintf(stderr, "cannot open the display %s\n",
+                     wayland != nullptr ? wayland : (display != nullptr ? display : ""));
+        std::_Exit(EXIT_FAILURE);
+    }
+    if (type == QtCriticalMsg) {
+        std::fprintf(stderr, "%s\n", text.toLocal8Bit().constData());
+    }
+}
+
+void serve_session() {
+    QObject::connect(qApp, &QGuiApplication::commitDataRequest, qApp, [](QSessionManager& /*session*/) {
+        if (quit_handler()) {
+            quit_handler()();
+        }
+    });
+    // The session restarts what the user starts; a copy that it makes by itself would be a second one.
+    QObject::connect(qApp, &QGuiApplication::saveStateRequest, qApp,
+                     [](QSessionManager& session) { session.setRestartHint(QSessionManager::RestartNever); });
+}
+
+} // namespace
+
+bool connect_display(std::string* problem) {
+    if (connected) {
+        return true;
+    }
+    if (QCoreApplication::instance() == nullptr) {
+        if (!has_display()) {
+            *problem = "there is no display: neither DISPLAY nor WAYLAND_DISPLAY is set";
+            return false;
+        }
+        const QtMessageHandler before = qInstallMessageHandler(end_without_display);
+        make_display_application();
+        qInstallMessageHandler(before);
+    }
+    if (qobject_cast<QGuiApplication*>(QCoreApplication::instance()) == nullptr) {
+        *problem = "the display cannot be used: the program has begun without one";
+        return false;
+    }
+    set_double_click_time(
+        static_cast<std::int64_t>(QGuiApplication::styleHints()->mouseDoubleClickInterval()) * 1000);
+    serve_session();
+    ScreenList::instance().follow();
+    MainThread::instance().start();
+    connected = true;
+    return true;
+}
+
+bool display_connected() {
+    return connected;
+}
+
+void run_display() {
+    if (!loop_to_end.exchange(false)) {
+        QCoreApplication::exec();
+        loop_to_end = false;
+    }
+}
+
+void end_display_loop() {
+    loop_to_end = true;
+    // Behind everything that was asked for before.
+    MainThread::instance().add([] {
+        if (loop_to_end) {
+            QCoreApplication::quit();
+        }
+    });
+}
+
+void set_quit_handler(std::function<void()> handler) {
+    quit_handler() = std::move(handler);
+}
+
+void run_on_main_thread(std::function<void()> task) {
+    MainThread::instance().add(std::move(task));
+}
+
+} // namespace host

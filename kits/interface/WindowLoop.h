@@ -1,0 +1,21 @@
+// WindowLoop: the main loop of a program with windows. Internal to the kits.
+#pragma once
+
+#include "MainLoop.h"
+
+// Installed by being linked: a program that knows BWindow has it from its start on. It runs the display's
+// events in the thread that calls BApplication::Run(), which must be the process's first, and ends it with
+// one line on standard error and exit status 1 when there is no display. What has to be there before the
+// first window and the first text is there before the application's own thread begins.
+class WindowLoop : public MainLoop {
+  public:
+    // In main(), before Run(), a window may be made already. Without effect elsewhere.
+    static void Connect();
+
+    bool Prepare() override;
+    bool Run() override;
+    void Quit() override;
+
+    // Constructed once, before main().
+    WindowLoop();
+};
