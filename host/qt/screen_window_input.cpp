@@ -135,7 +135,10 @@ void ScreenWindow::focusOutEvent(QFocusEvent* /*event*/) {
         // Some window managers give pop-ups the focus; to the program its window stays the active one.
         return;
     }
-    PopupStack::instance().dismiss();
+    // A pop-up that goes hands the focus back to the window below it; the other pop-ups stay.
+    if (!is_popup() || next == nullptr) {
+        PopupStack::instance().dismiss();
+    }
     if (active_) {
         active_ = false;
         listener_->activated(false);
