@@ -104,7 +104,8 @@ void end_display_loop() {
     // Behind everything that was asked for before.
     MainThread::instance().add([] {
         if (loop_to_end) {
-            QCoreApplication::quit();
+            // Not quit(), which would ask the windows: their own threads have been asked already.
+            QCoreApplication::exit(0);
         }
     });
 }

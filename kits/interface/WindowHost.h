@@ -55,6 +55,7 @@ class WindowHost : public ViewHost {
     const WindowTraits& Traits() const { return mTraits; }
     const std::shared_ptr<host::WindowPeer>& Peer() const { return mPeer; }
     WindowEvents& Events() { return *mEvents; }
+    const std::shared_ptr<WindowEvents>& SharedEvents() const { return mEvents; }
     WindowGeometry::Margins Margins() const;
     // Tells the display of changed traits or limits.
     void TraitsChanged();
