@@ -180,7 +180,9 @@ void BAlert::Build() {
     MoveTo(AlertPosition(layout.bounds.Width(), layout.bounds.Height()));
     AddChild(view);
     if (!mParts.labels.empty()) {
-        SetDefaultButton(mButtons[mParts.labels.size() - 1]);
+        BButton* const last = mButtons[mParts.labels.size() - 1];
+        SetDefaultButton(last);
+        last->MakeFocus(true);
     }
 }
 
@@ -244,8 +246,11 @@ void BAlert::MessageReceived(BMessage* message) {
 }
 
 void BAlert::DispatchMessage(BMessage* message, BHandler* handler) {
-    if (message->what == B_KEY_DOWN && PressByKey(message->GetString("bytes", ""))) {
-        return;
+    if (message->what == B_KEY_DOWN) {
+        const char* const bytes = message->GetString("bytes", "");
+        if (PressByKey(bytes) || MoveByKey(bytes)) {
+            return;
+        }
     }
     BWindow::DispatchMessage(message, handler);
 }
@@ -257,7 +262,30 @@ bool BAlert::PressByKey(const char* bytes) {
             return true;
         }
     }
+    const auto focus = std::find(mButtons.begin(), mButtons.end(), CurrentFocus());
+    if (bytes[0] == B_ENTER && bytes[1] == '\0' && focus != mButtons.end() && *focus != nullptr) {
+        // The window would press the default one.
+        (void)(*focus)->Invoke();
+        return true;
+    }
     return false;
+}
+
+// Arrows lead from button to button, and stop at both ends.
+bool BAlert::MoveByKey(const char* bytes) {
+    const int32 step = bytes[0] == B_LEFT_ARROW ? -1 : 1;
+    if ((bytes[0] != B_LEFT_ARROW && bytes[0] != B_RIGHT_ARROW) || bytes[1] != '\0') {
+        return false;
+    }
+    const auto focus = std::find(mButtons.begin(), mButtons.end(), CurrentFocus());
+    if (focus == mButtons.end() || *focus == nullptr) {
+        return false;
+    }
+    const auto next = static_cast<int32>(focus - mButtons.begin()) + step;
+    if (BButton* const button = ButtonAt(next); button != nullptr) {
+        button->MakeFocus(true);
+    }
+    return true;
 }
 
 BPoint BAlert::AlertPosition(float width, float height) {

@@ -77,6 +77,7 @@ class BAlert : public BWindow {
     BAlert(const char* title, Parts parts);
     void Build();
     bool PressByKey(const char* bytes);
+    bool MoveByKey(const char* bytes);
 
     Parts mParts;
     // The window's.
