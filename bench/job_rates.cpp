@@ -5,22 +5,18 @@
 // attributes)
 
 #include "app/QuirnelApp.h"
-#include "indexing/FileIndexListItem.h"
-#include "samples/SampleLibrary.h"
 #include "support/BareLoops.h"
 #include "support/Figures.h"
+#include "support/Jobs.h"
+#include "support/ProcessMemory.h"
 #include "support/Surroundings.h"
 #include <IndexMaintenance.h>
-#include <OS.h>
-#include <Volume.h>
-#include <VolumeRoster.h>
+#include <array>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <functional>
 #include <string>
-#include <sys/wait.h>
-#include <unistd.h>
 
 namespace {
 
@@ -29,42 +25,6 @@ namespace fs = std::filesystem;
 struct Rates {
     std::vector<double> tag, read, strip;
 };
-
-/// A field of /proc/self/status, in bytes.
-double StatusBytes(const std::string& field) {
-    std::ifstream status("/proc/self/status");
-    for (std::string line; std::getline(status, line);) {
-        if (line.rfind(field + ":", 0) == 0)
-            return std::strtod(line.c_str() + field.size() + 1, nullptr) * 1024;
-    }
-    return 0;
-}
-
-enum class Job { index, strip };
-
-/// Files per second of one whole job on the volume, index writes included.
-double RunJob(const BVolume& volume, Job job, std::size_t expected) {
-    auto entry = std::make_unique<VolumeListEntry>();
-    entry->query = std::make_unique<BQuery>();
-    entry->volume = std::make_unique<BVolume>(volume);
-    entry->knowsQuery = true;
-    FileIndexListItem row(entry.release());
-    const bench::Stopwatch watch;
-    if (job == Job::index)
-        row.IndexAttributes();
-    else
-        row.EraseAttributes();
-    status_t ignored = 0;
-    wait_for_thread(row.Thread(), &ignored);
-    sync_index(volume.Device());
-    const double seconds = watch.Seconds();
-    if (static_cast<std::size_t>(row.FileCount()) != expected) {
-        std::fprintf(stderr, "the job came to %d files instead of %zu\n", static_cast<int>(row.FileCount()),
-                     expected);
-        std::exit(1);
-    }
-    return static_cast<double>(expected) / seconds;
-}
 
 double Rate(const std::function<bench::Visited()>& loop, std::size_t expected) {
     const bench::Stopwatch watch;
@@ -76,32 +36,15 @@ double Rate(const std::function<bench::Visited()>& loop, std::size_t expected) {
     return static_cast<double>(expected) / watch.Seconds();
 }
 
-void MakeLibrary(const fs::path& root, std::size_t count) {
-    if (const std::string problem = samples::WriteLargeLibrary(root.string(), count); !problem.empty()) {
-        std::fprintf(stderr, "%s\n", problem.c_str());
-        std::exit(1);
-    }
-}
-
-BVolume OnlyVolume() {
-    BVolumeRoster roster;
-    BVolume volume;
-    if (roster.GetNextVolume(&volume) != B_OK || !volume.KnowsQuery()) {
-        std::fprintf(stderr, "this folder's file system holds no attributes\n");
-        std::exit(1);
-    }
-    return volume;
-}
-
 /// The same rounds at one size: our jobs on one tree, bare loops on its twin, in turn.
 void Measure(const fs::path& folder, std::size_t count, int rounds, Rates& ours, Rates& bare) {
     const fs::path volume_root = folder / ("volume-" + std::to_string(count));
     const fs::path twin = folder / ("twin-" + std::to_string(count));
-    MakeLibrary(volume_root, count);
-    MakeLibrary(twin, count);
+    bench::MakeLibrary(volume_root, count);
+    bench::MakeLibrary(twin, count);
     setenv("BEKITS_VOLUMES", volume_root.c_str(), 1);
     sync();
-    const BVolume volume = OnlyVolume();
+    const BVolume volume = bench::OnlyVolume();
     QuirnelApp app;
     app.CheckCreateIndices();
     // What one side leaves for the file system to write back is paid by the other, so they take turns at
@@ -118,28 +61,49 @@ void Measure(const fs::path& folder, std::size_t count, int rounds, Rates& ours,
     for (int round = 0; round < rounds; ++round) {
         in_turn(
             round, [&] { bare.tag.push_back(Rate([&] { return bench::BareTag(twin); }, count)); },
-            [&] { ours.tag.push_back(RunJob(volume, Job::index, count)); });
+            [&] { ours.tag.push_back(bench::RunJob(volume, bench::Job::index, count)); });
         in_turn(
             round, [&] { bare.read.push_back(Rate([&] { return bench::BareRead(twin); }, count)); },
-            [&] { ours.read.push_back(RunJob(volume, Job::index, count)); });
+            [&] { ours.read.push_back(bench::RunJob(volume, bench::Job::index, count)); });
         in_turn(
             round, [&] { bare.strip.push_back(Rate([&] { return bench::BareStrip(twin); }, count)); },
-            [&] { ours.strip.push_back(RunJob(volume, Job::strip, count)); });
+            [&] { ours.strip.push_back(bench::RunJob(volume, bench::Job::strip, count)); });
     }
     close_indices();
     fs::remove_all(volume_root);
     fs::remove_all(twin);
 }
 
-/// Each size in a process of its own, so that neither warms the other's memory.
-bool Apart(const std::function<bool()>& work) {
-    std::fflush(stdout);
-    const pid_t child = fork();
-    if (child == 0)
-        _exit(work() ? 0 : 1);
-    int status = 0;
-    waitpid(child, &status, 0);
-    return WIFEXITED(status) && WEXITSTATUS(status) == 0;
+/// The memory of a program that tags a volume, while it does so: it must not grow with the files.
+bool MeasureMemory(const fs::path& folder, std::size_t count) {
+    const fs::path volume_root = folder / "memory";
+    bench::MakeLibrary(volume_root, count);
+    setenv("BEKITS_VOLUMES", volume_root.c_str(), 1);
+    const BVolume volume = bench::OnlyVolume();
+    QuirnelApp app;
+    app.CheckCreateIndices();
+    constexpr std::array<std::size_t, 5> kPercent = {10, 25, 50, 75, 100};
+    std::vector<double> resident;
+    // Without the pages of the index file, which the kernel takes back when it wants them.
+    std::vector<double> own;
+    const auto note_from = [&](std::size_t files) {
+        while (own.size() < kPercent.size() && files * 100 >= count * kPercent[own.size()]) {
+            resident.push_back(bench::ResidentBytes() / 1e6);
+            own.push_back(bench::StatusBytes("RssAnon") / 1e6);
+        }
+    };
+    bench::RunJob(volume, bench::Job::index, count, note_from);
+    note_from(count);
+    std::printf(
+        "(memory of the index job at 10, 25, 50, 75, 100 %% of its files, index file's pages included:");
+    for (std::size_t i = 0; i < own.size(); ++i)
+        std::printf(" %.1f (%.1f)", own[i], resident[i]);
+    std::printf(" MB)\n");
+    const bool flat = bench::Report("memory at the end of the index job", own[4], "MB", "half-way through",
+                                    own[2], 1.1, bench::Better::lower);
+    close_indices();
+    fs::remove_all(volume_root);
+    return flat;
 }
 
 } // namespace
@@ -151,7 +115,7 @@ int main(int argc, char** argv) {
     const fs::path& folder = surroundings.Folder();
 
     const fs::path small_rates = folder / "small-rates";
-    bool reached = Apart([&] {
+    bool reached = bench::Apart([&] {
         Rates ours;
         Rates bare;
         Measure(folder, count / 10, rounds, ours, bare);
@@ -159,8 +123,8 @@ int main(int argc, char** argv) {
         return true;
     });
     reached =
-        Apart([&] {
-            const double before = StatusBytes("VmRSS");
+        bench::Apart([&] {
+            const double before = bench::ResidentBytes();
             Rates ours;
             Rates bare;
             Measure(folder, count, rounds, ours, bare);
@@ -176,11 +140,12 @@ int main(int argc, char** argv) {
             std::ifstream(small_rates) >> small;
             all &= bench::Report("index job, time per file", 1e6 / bench::Median(ours.tag), "us",
                                  "at a tenth of the files", 1e6 / small, 1.25, Better::lower);
-            all &= bench::Report("peak memory of all jobs", StatusBytes("VmHWM") / 1e6, "MB", "limit", 150,
-                                 1.0, Better::lower);
+            all &= bench::Report("peak memory of all jobs", bench::StatusBytes("VmHWM") / 1e6, "MB", "limit",
+                                 150, 1.0, Better::lower);
             std::printf("(memory before the first job: %.1f MB)\n", before / 1e6);
             return all;
         }) &&
         reached;
+    reached = bench::Apart([&] { return MeasureMemory(folder, count); }) && reached;
     return reached ? 0 : 1;
 }

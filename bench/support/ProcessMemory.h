@@ -1,0 +1,23 @@
+#pragma once
+
+#include <cstdlib>
+#include <fstream>
+#include <string>
+
+namespace bench {
+
+/// A field of /proc/self/status, in bytes: "VmRSS", "VmHWM".
+inline double StatusBytes(const std::string& field) {
+    std::ifstream status("/proc/self/status");
+    for (std::string line; std::getline(status, line);) {
+        if (line.rfind(field + ":", 0) == 0)
+            return std::strtod(line.c_str() + field.size() + 1, nullptr) * 1024;
+    }
+    return 0;
+}
+
+inline double ResidentBytes() {
+    return StatusBytes("VmRSS");
+}
+
+} // namespace bench
