@@ -43,6 +43,9 @@ enum : uint32 {
 
     // Sent by a looper to itself: end the loop behind the messages that are already queued.
     _QUIT_ = '_QIT',
+    // Sent to an application whose windows are to come to the front; "token" (string) is the desktop's token
+    // for that, when there is one.
+    _ACTIVATE_APP_ = '_AAP',
     // Sent to a view that something was dropped on.
     _MESSAGE_DROPPED_ = '_MDP',
 

@@ -1,10 +1,12 @@
 #include <Application.h>
 
+#include "AppClaim.h"
 #include "MainLoop.h"
 #include "MessageDelivery.h"
 #include "TokenTable.h"
 #include "host/api/directories.h"
 #include "host/api/termination.h"
+#include <MessageQueue.h>
 #include <MessageRunner.h>
 #include <Roster.h>
 
@@ -68,6 +70,7 @@ void BApplication::Initialise(const char* signature) {
     }
     // Not fatal: what needs the directory reports that it is not there.
     (void)host::make_directories(host::config_directory() + "/settings");
+    mActivationToken = activation_token();
     be_app = this;
     be_app_messenger = BMessenger(nullptr, this);
     MessageDelivery::SetDefaultReplyTarget(MessageDelivery::AddressOf(be_app_messenger).token);
@@ -104,6 +107,8 @@ status_t BApplication::InitCheck() const {
 thread_id BApplication::Run() {
     if (mInitStatus != B_OK)
         return mInitStatus;
+    if (mClaim != nullptr)
+        return B_BAD_THREAD_STATE;
     const auto termination = host::watch_for_termination([this] { PostMessage(B_QUIT_REQUESTED); });
     const auto endUnless = [](bool works) {
         if (works)
@@ -113,17 +118,43 @@ thread_id BApplication::Run() {
         std::_Exit(EXIT_FAILURE);
     };
     endUnless(sMainLoop == nullptr || sMainLoop->Prepare());
+    mClaim = std::make_unique<AppClaim>(mSignature, mActivationToken);
+    const status_t claimed = mClaim->Take(MessageDelivery::AddressOf(be_app_messenger).token);
+    if (claimed == B_ALREADY_RUNNING)
+        return claimed;
+    if (claimed != B_OK)
+        std::fprintf(stderr, "%s runs, but other programs cannot find it: %s\n", mSignature.c_str(),
+                     strerror(claimed));
+    HandleFirst(mClaim->TakeMessages());
     const thread_id thread = StartThread(&BApplication::ThreadEntry);
-    if (thread < 0)
+    if (thread < 0) {
+        mClaim->Release();
         return thread;
+    }
+    mClaim->Confirm(thread);
     endUnless(sMainLoop == nullptr || sMainLoop->Run());
     wait_for_thread(thread, nullptr);
     return thread;
 }
 
+// In front of what waits already, B_READY_TO_RUN included.
+void BApplication::HandleFirst(MessageList messages) {
+    BMessageQueue* const queue = MessageQueue();
+    queue->Lock();
+    MessageList waiting;
+    while (BMessage* message = queue->NextMessage())
+        waiting.emplace_back(message);
+    for (const std::unique_ptr<BMessage>& message : messages)
+        PostMessage(message.get());
+    for (std::unique_ptr<BMessage>& message : waiting)
+        queue->AddMessage(message.release());
+    queue->Unlock();
+}
+
 int32 BApplication::ThreadEntry(void* data) {
     BApplication* application = static_cast<BApplication*>(data);
     application->Loop();
+    application->mClaim->Release();
     if (sMainLoop != nullptr)
         sMainLoop->Quit();
     return 0;
@@ -166,6 +197,9 @@ void BApplication::SetPulseRate(bigtime_t rate) {
 }
 
 void BApplication::MessageReceived(BMessage* message) {
+    // Started again: its windows are brought to the front by a message of its own.
+    if (message->what == B_SILENT_RELAUNCH)
+        return;
     BMessage specifier;
     const char* property = nullptr;
     if (message->what == B_GET_PROPERTY &&
@@ -208,6 +242,13 @@ void BApplication::DispatchMessage(BMessage* message, BHandler* handler) {
         break;
     case B_PULSE:
         Pulse();
+        break;
+    case _ACTIVATE_APP_:
+        // Windows tell by themselves when they have got the focus.
+        if (sMainLoop != nullptr)
+            sMainLoop->Activate(message->GetString("token", ""));
+        else
+            AppActivated(true);
         break;
     case B_APP_ACTIVATED:
         AppActivated(message->GetBool("active", false));

@@ -4,6 +4,9 @@
 #include <Looper.h>
 #include <Messenger.h>
 
+#include <vector>
+
+class AppClaim;
 class BList;
 class BMessageRunner;
 struct app_info;
@@ -71,8 +74,13 @@ class BApplication : public BLooper {
   private:
     void Initialise(const char* signature);
     static int32 ThreadEntry(void* application);
+    void HandleFirst(std::vector<std::unique_ptr<BMessage>> messages);
 
     std::string mSignature;
+    // The desktop's, for the windows' coming to the front; read before anybody else takes it.
+    std::string mActivationToken;
+    // This process as a running application; null before Run().
+    std::unique_ptr<AppClaim> mClaim;
     status_t mInitStatus = B_OK;
     std::atomic<bool> mReadyToRunCalled{false};
     bigtime_t mPulseRate = 0;

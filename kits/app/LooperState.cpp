@@ -43,6 +43,21 @@ status_t LooperState::Deliver(std::unique_ptr<BMessage> message, bigtime_t timeo
     return Post(std::move(message));
 }
 
+status_t LooperState::DeliverNow(std::unique_ptr<BMessage>& message) {
+    queue.Lock();
+    status_t status = B_OK;
+    if (mClosed)
+        status = B_BAD_PORT_ID;
+    else if (queue.CountMessages() >= capacity)
+        status = B_WOULD_BLOCK;
+    else
+        queue.AddMessage(message.release());
+    queue.Unlock();
+    if (status == B_OK)
+        Ring();
+    return status;
+}
+
 void LooperState::Ring() {
     GuardLock guard(mBellMutex);
     mArrivals++;

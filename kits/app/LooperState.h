@@ -22,6 +22,8 @@ class LooperState {
     // First waits for the queue to fall below its capacity. B_TIMED_OUT or B_WOULD_BLOCK (time-out of 0) when
     // it does not; B_BAD_PORT_ID.
     status_t Deliver(std::unique_ptr<BMessage> message, bigtime_t timeout);
+    // Without waiting: B_WOULD_BLOCK, B_BAD_PORT_ID. The message is the caller's still unless it succeeds.
+    status_t DeliverNow(std::unique_ptr<BMessage>& message);
     // Waits for a message and takes it; null once closed. For the looper's own thread.
     std::unique_ptr<BMessage> WaitForMessage();
     // Refuses messages from now on, wakes everyone who waits and deletes the messages that are left.

@@ -17,15 +17,22 @@ BMessage::BMessage(const BMessage& other)
     : what(other.what), mFields(other.mFields), mCurrentSpecifier(other.mCurrentSpecifier) {}
 
 BMessage::~BMessage() {
-    if (IsSourceWaiting())
-        SendReply(B_NO_REPLY);
+    AnswerThatThereIsNone();
+}
+
+// A sender in another process that does not even take this does not hold up the one who lets a message go.
+void BMessage::AnswerThatThereIsNone() {
+    constexpr bigtime_t kPatience = 1'000'000;
+    if (!IsSourceWaiting())
+        return;
+    BMessage none(B_NO_REPLY);
+    SendReply(&none, BMessenger(), kPatience);
 }
 
 BMessage& BMessage::operator=(const BMessage& other) {
     if (this == &other)
         return *this;
-    if (IsSourceWaiting())
-        SendReply(B_NO_REPLY);
+    AnswerThatThereIsNone();
     what = other.what;
     mFields = other.mFields;
     mCurrentSpecifier = other.mCurrentSpecifier;
@@ -40,8 +47,7 @@ BMessage::BMessage(BMessage&& other) noexcept {
 BMessage& BMessage::operator=(BMessage&& other) noexcept {
     if (this == &other)
         return *this;
-    if (IsSourceWaiting())
-        SendReply(B_NO_REPLY);
+    AnswerThatThereIsNone();
     Take(other);
     return *this;
 }

@@ -247,6 +247,7 @@ class BMessage {
         std::shared_ptr<const BMessage> previous;
     };
 
+    void AnswerThatThereIsNone();
     void Take(BMessage& other);
     status_t AddItem(const char* name, type_code type, std::span<const char> item, bool fixedSize,
                      int32 count = 1);

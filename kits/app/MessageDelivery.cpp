@@ -1,5 +1,7 @@
 #include "MessageDelivery.h"
 
+#include "MessageCodec.h"
+#include "MessageTransport.h"
 #include "ReplyBox.h"
 #include "TokenTable.h"
 
@@ -15,6 +17,9 @@ team_id ThisTeam() {
     }();
     return team;
 }
+
+// Leaves room for the envelope in the largest request.
+constexpr uint64 kLargestSentMessage = uint64{64} << 20;
 
 std::atomic<int32> sDefaultReplyToken{0};
 
@@ -36,8 +41,9 @@ bool IsThisThread(const MessengerAddress& target) {
 // A reply box under its token, for as long as somebody waits at it.
 class RegisteredReplyBox {
   public:
-    RegisteredReplyBox()
-        : box(std::make_shared<ReplyBox>()), mToken(TokenTable::Instance().AddReplyBox(box)) {}
+    // For a reply from that team.
+    explicit RegisteredReplyBox(team_id team)
+        : box(std::make_shared<ReplyBox>(team)), mToken(TokenTable::Instance().AddReplyBox(box)) {}
     ~RegisteredReplyBox() { TokenTable::Instance().Remove(mToken); }
     RegisteredReplyBox(const RegisteredReplyBox&) = delete;
     RegisteredReplyBox& operator=(const RegisteredReplyBox&) = delete;
@@ -98,16 +104,84 @@ status_t MessageDelivery::SendAddressed(std::unique_ptr<BMessage> message, bigti
     const MessengerAddress target = message->mDelivery.target;
     status_t status = B_BAD_PORT_ID;
     if (target.token != 0 && !IsThisTeam(target.team)) {
-        status = B_BAD_TEAM_ID;
+        status = SendToTeam(*message, timeout);
     } else if (const std::shared_ptr<ReplyBox> box = TokenTable::Instance().FindReplyBox(target.token)) {
-        return box->Put(std::move(message));
+        status = box->Put(message);
     } else if (const TokenTable::Target found = TokenTable::Instance().Find(target.token); found.looper) {
         // Null once the looper has taken it, also when that has failed.
         return found.looper->Deliver(std::move(message), timeout);
     }
-    // It never left, so it does not answer for its handler as it goes away.
-    message->mDelivery.sourceWaiting = false;
+    // Not taken, or the other process has its own copy: this one does not answer for a handler as it goes
+    // away.
+    if (message != nullptr)
+        message->mDelivery.sourceWaiting = false;
     return status;
+}
+
+status_t MessageDelivery::SendToTeam(const BMessage& message, bigtime_t timeout) {
+    // The reply, or a messenger in the message, has to find its way back.
+    if (const status_t status = MessageTransport::Open(); status != B_OK)
+        return status;
+    const BMessage::Delivery& delivery = message.mDelivery;
+    MessageEnvelope envelope;
+    envelope.target = delivery.target.token;
+    envelope.targetPreferred = delivery.target.preferred;
+    envelope.sourceWaiting = delivery.sourceWaiting;
+    envelope.isReply = delivery.isReply;
+    envelope.dropped = delivery.dropped;
+    envelope.replyTo = delivery.replyTo;
+    envelope.dropPoint = delivery.dropPoint;
+    envelope.dropOffset = delivery.dropOffset;
+    const uint64 size = flattened_message_size(message.mFields);
+    uint64 previousSize =
+        delivery.previous != nullptr ? flattened_message_size(delivery.previous->mFields) : 0;
+    if (size > kLargestSentMessage)
+        return B_NO_MEMORY;
+    // Rather the reply alone than none.
+    if (previousSize > kLargestSentMessage - size)
+        previousSize = 0;
+    std::vector<char> request = make_request(envelope, size, previousSize);
+    flatten_message(message.what, message.mFields, request.data() + kEnvelopeSize);
+    if (previousSize > 0)
+        flatten_message(delivery.previous->what, delivery.previous->mFields,
+                        request.data() + kEnvelopeSize + size);
+    return MessageTransport::Send(delivery.target.team, request, timeout);
+}
+
+status_t MessageDelivery::Receive(const MessageEnvelope& envelope) {
+    auto message = std::make_unique<BMessage>();
+    if (message->Unflatten(envelope.message.data(), envelope.message.size()) != B_OK)
+        return B_BAD_DATA;
+    BMessage::Delivery& delivery = message->mDelivery;
+    if (!envelope.previous.empty()) {
+        auto previous = std::make_shared<BMessage>();
+        if (previous->Unflatten(envelope.previous.data(), envelope.previous.size()) != B_OK)
+            return B_BAD_DATA;
+        delivery.previous = std::move(previous);
+    }
+    delivery.delivered = true;
+    delivery.target = LocalAddress(envelope.target, envelope.targetPreferred);
+    delivery.replyTo = envelope.replyTo;
+    delivery.isReply = envelope.isReply;
+    delivery.dropped = envelope.dropped;
+    delivery.dropPoint = envelope.dropPoint;
+    delivery.dropOffset = envelope.dropOffset;
+    delivery.sourceWaiting = envelope.sourceWaiting;
+    status_t status = B_BAD_PORT_ID;
+    if (const std::shared_ptr<ReplyBox> box = TokenTable::Instance().FindReplyBox(envelope.target))
+        status = box->Put(message);
+    else if (const TokenTable::Target found = TokenTable::Instance().Find(envelope.target); found.looper)
+        status = found.looper->DeliverNow(message);
+    // Not taken, it owes nobody a reply: the sender hears of it here and now.
+    if (message != nullptr)
+        message->mDelivery.sourceWaiting = false;
+    return status;
+}
+
+bool MessageDelivery::HasTarget(int32 token) {
+    const TokenTable& table = TokenTable::Instance();
+    const std::shared_ptr<LooperState> looper = table.Find(token).looper;
+    return looper != nullptr ? looper->IsOpen() : table.FindReplyBox(token) != nullptr;
 }
 
 status_t MessageDelivery::Send(const BMessage& message, const MessengerAddress& target,
@@ -139,7 +213,7 @@ status_t MessageDelivery::SendAndWait(const BMessage& message, const MessengerAd
         return B_BAD_VALUE;
     if (IsThisThread(target))
         return B_MESSAGE_TO_SELF;
-    RegisteredReplyBox waiting;
+    RegisteredReplyBox waiting(target.team);
     return Exchange(Address(message, target, waiting.Address(), Waiting::forReply), *waiting.box, reply,
                     deliveryTimeout, replyTimeout);
 }
@@ -175,7 +249,7 @@ status_t MessageDelivery::ReplyAndWait(BMessage& request, const BMessage& reply,
         return status;
     if (IsThisThread(request.mDelivery.replyTo))
         return B_MESSAGE_TO_SELF;
-    RegisteredReplyBox waiting;
+    RegisteredReplyBox waiting(request.mDelivery.replyTo.team);
     return Exchange(AddressReply(request, reply, waiting.Address(), Waiting::forReply), *waiting.box,
                     replyToReply, sendTimeout, replyTimeout);
 }

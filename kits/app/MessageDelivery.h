@@ -5,12 +5,12 @@
 #include <Messenger.h>
 
 class ReplyBox;
+struct MessageEnvelope;
 
 // The one place that turns an address into a queue, and the one that writes how a message was delivered.
 // Addresses of this process are resolved through the TokenTable and the message is copied, not flattened.
-// Addresses of other teams are refused with B_BAD_TEAM_ID in SendAddressed(), through which every message
-// passes that does not come by Post(): a transport between processes (a flattened message, the target's token
-// and the return address) would begin there, and end in a call of it. Any thread.
+// SendAddressed(), through which every message passes that does not come by Post(), hands those for other
+// teams to the MessageTransport, flattened; there Receive() takes them up. Any thread.
 class MessageDelivery {
   public:
     enum class Waiting { none, forReply };
@@ -27,6 +27,12 @@ class MessageDelivery {
                           bigtime_t timeout);
     static status_t ReplyAndWait(BMessage& request, const BMessage& reply, BMessage* replyToReply,
                                  bigtime_t sendTimeout, bigtime_t replyTimeout);
+
+    // What another process has sent, in the transport's thread: does not wait for room in a queue
+    // (B_WOULD_BLOCK). B_BAD_PORT_ID for a target that is not there, B_BAD_DATA for what is no message.
+    static status_t Receive(const MessageEnvelope& envelope);
+    // Whether messages to the target find somebody, in this process.
+    static bool HasTarget(int32 token);
 
     static bool IsThisTeam(team_id team);
     static MessengerAddress LocalAddress(int32 token, bool preferred);
@@ -48,6 +54,7 @@ class MessageDelivery {
                                              const MessengerAddress& replyTo, Waiting waiting);
     // To the target that Address() has written into the message.
     static status_t SendAddressed(std::unique_ptr<BMessage> message, bigtime_t timeout);
+    static status_t SendToTeam(const BMessage& message, bigtime_t timeout);
     static status_t Exchange(std::unique_ptr<BMessage> message, ReplyBox& waiting, BMessage* reply,
                              bigtime_t sendTimeout, bigtime_t replyTimeout);
     static status_t MayReply(const BMessage& request);

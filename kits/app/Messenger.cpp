@@ -1,8 +1,9 @@
 #include <Messenger.h>
 
 #include "MessageDelivery.h"
+#include "MessageTransport.h"
+#include "RunningApps.h"
 #include "TokenTable.h"
-#include <Application.h>
 #include <Looper.h>
 
 BMessenger be_app_messenger;
@@ -25,11 +26,12 @@ status_t BMessenger::SetTo(const char* signature, team_id team) {
     mAddress = MessengerAddress();
     if (signature == nullptr && team < 0)
         return B_BAD_VALUE;
-    if (team >= 0 && !MessageDelivery::IsThisTeam(team))
-        return B_BAD_TEAM_ID;
-    if (be_app == nullptr || (signature != nullptr && !be_app->HasSignature(signature)))
-        return B_ERROR;
-    mAddress = be_app_messenger.mAddress;
+    const std::optional<RunningApp> app = team >= 0 ? running_app(team) : running_app(signature);
+    if (!app)
+        return team >= 0 ? B_BAD_TEAM_ID : B_ERROR;
+    if (signature != nullptr && !is_same_signature(signature, app->signature.c_str()))
+        return B_MISMATCHED_VALUES;
+    mAddress = app->address;
     return B_OK;
 }
 
@@ -112,11 +114,9 @@ status_t BMessenger::SendMessage(BMessage* message, BMessage* reply, bigtime_t d
 }
 
 bool BMessenger::IsValid() const {
-    if (!IsTargetLocal())
+    if (mAddress.token == 0)
         return false;
-    const TokenTable& table = TokenTable::Instance();
-    const std::shared_ptr<LooperState> looper = table.Find(mAddress.token).looper;
-    return looper != nullptr ? looper->IsOpen() : table.FindReplyBox(mAddress.token) != nullptr;
+    return IsTargetLocal() ? MessageDelivery::HasTarget(mAddress.token) : MessageTransport::IsThere(mAddress);
 }
 
 team_id BMessenger::Team() const {

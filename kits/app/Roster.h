@@ -81,8 +81,8 @@ class BRoster {
     // the front: B_ALREADY_RUNNING. `team`, which may be null, receives its team in both cases.
     // Messages are copied. Also B_LAUNCH_FAILED when it could not be started or ended before it ran;
     // B_TIMED_OUT when after ten seconds it does not run although its process lives.
-    // A program of the desktop that is not built on the kits (the preferred one of a type) is started at
-    // once: from messages it gets the paths of their "refs".
+    // A program of the desktop (the preferred one of a type, or an executable without a record) need not be
+    // built on the kits and is not waited for: from messages it gets the paths of their "refs".
     status_t Launch(const char* mimeType, const BMessage* message = nullptr, team_id* team = nullptr) const;
     status_t Launch(const char* mimeType, const BList* messages, team_id* team = nullptr) const;
     status_t Launch(const char* mimeType, int argc, const char* const* args, team_id* team = nullptr) const;
@@ -95,8 +95,9 @@ class BRoster {
     // Asks the application to bring its windows to the front. B_BAD_TEAM_ID.
     status_t ActivateApp(team_id team) const;
 
-    // Tells `target` of applications that begin or end from now on; once for each target. B_BAD_VALUE for an
-    // event that is none of the above.
+    // Tells `target`, which lies in this process, of applications that begin or end from now on. A target
+    // whose queue is full misses what happens meanwhile. Called again it replaces the events. B_BAD_VALUE for
+    // a target elsewhere, for no event and for one that is none of the above.
     status_t StartWatching(BMessenger target, uint32 events = B_REQUEST_LAUNCHED | B_REQUEST_QUIT) const;
     // B_BAD_VALUE for a target that is not told.
     status_t StopWatching(BMessenger target) const;

@@ -1,6 +1,11 @@
 #include "TokenTable.h"
 
+#include "ReplyBox.h"
+
 #include <algorithm>
+#include <random>
+
+TokenTable::TokenTable() : mNext(static_cast<int32>(std::random_device()() >> 2) + 1) {}
 
 TokenTable& TokenTable::Instance() {
     // Never destroyed: handlers with static lifetime take their tokens back after every other destructor.
@@ -44,6 +49,19 @@ std::shared_ptr<ReplyBox> TokenTable::FindReplyBox(int32 token) const {
     GuardLock guard(mMutex);
     const auto found = mEntries.find(token);
     return found != mEntries.end() ? found->second.box : nullptr;
+}
+
+void TokenTable::FailReplyBoxes(team_id team, status_t status) {
+    std::vector<std::shared_ptr<ReplyBox>> failed;
+    {
+        GuardLock guard(mMutex);
+        for (const auto& [token, entry] : mEntries) {
+            if (entry.box != nullptr && entry.box->awaited == team)
+                failed.push_back(entry.box);
+        }
+    }
+    for (const std::shared_ptr<ReplyBox>& box : failed)
+        box->Fail(status);
 }
 
 LooperTable& LooperTable::Instance() {

@@ -12,6 +12,8 @@ class BHandler;
 class ReplyBox;
 
 // Tokens count up and are not given out twice, so one that has been taken back never finds somebody else.
+// They begin anywhere, so that one of a process that has ended hardly finds somebody in the process that gets
+// its number next.
 // Any thread; the table's lock is the innermost one, nothing is called with it held.
 class TokenTable {
   public:
@@ -32,15 +34,19 @@ class TokenTable {
 
     int32 AddReplyBox(std::shared_ptr<ReplyBox> box);
     std::shared_ptr<ReplyBox> FindReplyBox(int32 token) const;
+    // Tells everybody who waits for a reply from that team.
+    void FailReplyBoxes(team_id team, status_t status);
 
   private:
+    TokenTable();
+
     struct Entry {
         Target target;
         std::shared_ptr<ReplyBox> box;
     };
 
     mutable GuardMutex mMutex;
-    int32 mNext GUARDED_BY(mMutex) = 1;
+    int32 mNext GUARDED_BY(mMutex);
     std::unordered_map<int32, Entry> mEntries GUARDED_BY(mMutex);
 };
 

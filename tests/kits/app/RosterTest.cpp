@@ -1,4 +1,5 @@
 // The roster: which applications run.
+#include "RunningApplication.h"
 #include "SeenMessages.h"
 #include "support/temporary_environment.h"
 
@@ -33,8 +34,21 @@ TEST_F(RosterTest, WithoutAnApplicationNoneRuns) {
     EXPECT_EQ(be_roster->Broadcast(&message), B_OK);
 }
 
-TEST_F(RosterTest, TheRunningApplicationIsFoundWhateverTheCaseOfItsSignature) {
+TEST_F(RosterTest, AnApplicationThatIsNotRunIsNotARunningOne) {
     BApplication application(kSignature);
+    EXPECT_FALSE(be_roster->IsRunning(kSignature));
+    BList teams;
+    be_roster->GetAppList(&teams);
+    EXPECT_EQ(teams.CountItems(), 0);
+    status_t result = B_OK;
+    EXPECT_FALSE(BMessenger(kSignature, -1, &result).IsValid());
+    EXPECT_EQ(result, B_ERROR);
+    EXPECT_FALSE(BMessenger(nullptr, getpid(), &result).IsValid());
+    EXPECT_EQ(result, B_BAD_TEAM_ID);
+}
+
+TEST_F(RosterTest, TheRunningApplicationIsFoundWhateverTheCaseOfItsSignature) {
+    test::RunningApplication application(kSignature);
     EXPECT_TRUE(be_roster->IsRunning("application/x-vnd.Test-Roster"));
     EXPECT_TRUE(be_roster->IsRunning("APPLICATION/X-VND.test-roster"));
     EXPECT_FALSE(be_roster->IsRunning("application/x-vnd.Test-Roster2"));
@@ -48,17 +62,39 @@ TEST_F(RosterTest, TheRunningApplicationIsFoundWhateverTheCaseOfItsSignature) {
     EXPECT_EQ(teams.CountItems(), 1);
 }
 
-TEST_F(RosterTest, InfoNamesTheTeamTheSignatureAndTheThread) {
-    BApplication application(kSignature);
+TEST_F(RosterTest, AnApplicationThatHasEndedDoesNotRun) {
+    { test::RunningApplication application(kSignature); }
+    EXPECT_FALSE(be_roster->IsRunning(kSignature));
+}
+
+TEST_F(RosterTest, InfoNamesTheTeamTheSignatureTheThreadAndTheExecutable) {
+    test::RunningApplication application(kSignature);
     app_info info;
     ASSERT_EQ(be_roster->GetAppInfo(kSignature, &info), B_OK);
     EXPECT_EQ(info.team, getpid());
     EXPECT_STREQ(info.signature, "application/x-vnd.Test-Roster");
-    EXPECT_EQ(info.thread, -1);
-    ASSERT_EQ(application.GetAppInfo(&info), B_OK);
-    EXPECT_EQ(info.team, getpid());
+    EXPECT_GT(info.thread, 0);
+    EXPECT_EQ(info.flags, B_MULTIPLE_LAUNCH);
+    ASSERT_NE(info.ref.name, nullptr);
+    EXPECT_STREQ(info.ref.name, "test_kits_app");
+    EXPECT_EQ(be_roster->TeamFor(&info.ref), getpid());
     EXPECT_EQ(be_roster->GetAppInfo(kSignature, nullptr), B_BAD_VALUE);
     EXPECT_EQ(be_roster->GetRunningAppInfo(1, &info), B_BAD_TEAM_ID);
+}
+
+TEST_F(RosterTest, AMessengerFindsTheRunningApplication) {
+    test::RunningApplication application(kSignature);
+    status_t result = B_ERROR;
+    EXPECT_TRUE(BMessenger(kSignature, -1, &result) == be_app_messenger);
+    EXPECT_EQ(result, B_OK);
+    EXPECT_TRUE(BMessenger(nullptr, getpid(), &result) == be_app_messenger);
+    EXPECT_EQ(result, B_OK);
+    EXPECT_TRUE(BMessenger("application/x-vnd.Test-Roster", getpid(), &result) == be_app_messenger);
+    EXPECT_EQ(result, B_OK);
+    EXPECT_FALSE(BMessenger("application/x-vnd.Test-Other", getpid(), &result).IsValid());
+    EXPECT_EQ(result, B_MISMATCHED_VALUES);
+    EXPECT_FALSE(BMessenger(nullptr, 1, &result).IsValid());
+    EXPECT_EQ(result, B_BAD_TEAM_ID);
 }
 
 TEST_F(RosterTest, ABroadcastReachesTheApplication) {
