@@ -44,6 +44,31 @@ function(quirnel_program name)
   target_link_libraries(${name} PRIVATE ${ARG_LINKS} quirnel_options)
 endfunction()
 
+# quirnel_application(TARGET SIGNATURE signature LAUNCH multiple|single|exclusive [BACKGROUND] DESTINATION dir)
+# Says how a program that is built here is launched: writes its record (docs/applications.md) into the build tree, and
+# installs one that names the program in that directory below the prefix.
+function(quirnel_application target)
+  cmake_parse_arguments(ARG "BACKGROUND" "SIGNATURE;LAUNCH;DESTINATION" "" ${ARGN})
+  string(TOLOWER "${ARG_SIGNATURE}" leaf)
+  string(REPLACE "/" "," leaf "${leaf}")
+  set(background "")
+  if(ARG_BACKGROUND)
+    set(background "Background=true\n")
+  endif()
+  foreach(place IN ITEMS build install)
+    set(executable "$<TARGET_FILE:${target}>")
+    set(path "${PROJECT_BINARY_DIR}/share/bekits/applications/${leaf}.app")
+    if(place STREQUAL "install")
+      set(executable "${ARG_DESTINATION}/$<TARGET_FILE_NAME:${target}>")
+      set(path "${PROJECT_BINARY_DIR}/installed-records/${leaf}.app")
+    endif()
+    file(GENERATE OUTPUT "${path}" CONTENT
+      "[Application]\nSignature=${ARG_SIGNATURE}\nExecutable=${executable}\nLaunch=${ARG_LAUNCH}\n${background}")
+  endforeach()
+  install(TARGETS ${target} DESTINATION "${ARG_DESTINATION}")
+  install(FILES "${path}" DESTINATION share/bekits/applications)
+endfunction()
+
 # quirnel_test(NAME TIER quick|full|desktop|soak SOURCES a.cpp ... LINKS lib ... [TIMEOUT seconds] [SERIAL])
 # One GoogleTest program, run as one ctest entry labelled with its tier.
 # Every source under tests/ must come through here (or quirnel_test_sources).

@@ -8,8 +8,10 @@
 struct Request {
     std::string command;
     std::vector<std::string> arguments;
-    bool fields = false;  ///< --fields: a table of the songs' fields instead of paths
-    bool verbose = false; ///< --verbose: the classes' own diagnostics on standard error
+    bool fields = false;   ///< --fields: a table of the songs' fields instead of paths
+    bool launch = false;   ///< --launch: start the program when it does not run
+    std::string signature; ///< --to: whom a message goes to; empty for Quirnel
+    bool verbose = false;  ///< --verbose: the classes' own diagnostics on standard error
 };
 
 /// Writes "quirnelctl: TEXT" on standard error; 1.
@@ -24,3 +26,4 @@ int FindSongs(const Request& request, Output& output);
 int QueryFiles(const Request& request, Output& output);
 int ShowAttributes(const Request& request, Output& output);
 int SetCover(const Request& request, Output& output);
+int SendCode(const Request& request, Output& output);

@@ -29,10 +29,14 @@ constexpr char kUsage[] =
     "  attr FILE...                        every attribute: name, type, size, value\n"
     "  cover FILE IMAGE                    make IMAGE the cover of the song FILE\n"
     "  reindex [VOLUME-ROOT...]            rebuild a volume's index from the attributes on its files\n"
+    "  send [--launch] WHAT [--to SIGNATURE]\n"
+    "                                      post a message code, such as 103 or 'ABCD', to a running program\n"
     "\n"
     "  --json       one JSON object a line        --fields     a table of the songs' fields instead of "
     "paths\n"
     "  --null       end each path with a zero byte instead of a new line\n"
+    "  --to         the program that the message is for; Quirnel when it is left out\n"
+    "  --launch     start that program first when it does not run\n"
     "  --verbose    what the application would print on standard output, on standard error\n"
     "\n"
     "Without VOLUME-ROOT a command works on every volume that it can work on. Exit status 0, or 1 and one "
@@ -50,7 +54,7 @@ struct Command {
     bool searches;
 };
 
-constexpr std::array<Command, 8> kCommands = {{
+constexpr std::array<Command, 9> kCommands = {{
     {"volumes", ListVolumes, false, false, false},
     {"index", IndexVolumes, true, true, false},
     {"strip", StripVolumes, false, false, false},
@@ -59,6 +63,7 @@ constexpr std::array<Command, 8> kCommands = {{
     {"attr", ShowAttributes, false, false, false},
     {"cover", SetCover, true, true, false},
     {"reindex", ReindexVolumes, true, true, false},
+    {"send", SendCode, false, false, false},
 }};
 
 /// An empty text, or what is wrong with the command line.
@@ -81,6 +86,12 @@ std::string Parse(int count, char** arguments, Request& request, Output& output)
             request.fields = true;
         } else if (argument == "--verbose") {
             request.verbose = true;
+        } else if (argument == "--launch") {
+            request.launch = true;
+        } else if (argument == "--to") {
+            if (++at == count || arguments[at][0] == '\0')
+                return "--to wants the signature of a program";
+            request.signature = arguments[at];
         } else {
             return "no such option: " + Printable(std::string(argument));
         }
