@@ -302,5 +302,9 @@ void BMenuBar::AbandonSession() {
 void BMenuBar::ItemLeaves(BMenuItem* item) {
     if (mSession != nullptr) {
         mSession->Tracker().ItemLeaves(item);
+        if (mSession->IsOver()) {
+            // Its thread waits for something to happen.
+            mSession->Events()->Post({});
+        }
     }
 }
