@@ -98,6 +98,7 @@ class Peer : public BApplication {
             BApplication::MessageReceived(message);
             break;
         default:
+            Log("code " + std::to_string(message->what));
             BApplication::MessageReceived(message);
         }
     }
