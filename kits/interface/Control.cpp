@@ -61,6 +61,7 @@ BControl::BControl(BMessage* archive) : BView(archive) {
     bool disabled = false;
     if (archive->FindBool(kDisabledField, &disabled) == B_OK) {
         mEnabled = !disabled;
+        mNavigableWhenEnabled = disabled;
     }
     BMessage message;
     if (archive->FindMessage(kMessageField, &message) == B_OK) {
@@ -166,6 +167,15 @@ void BControl::SetEnabled(bool enabled) {
         return;
     }
     mEnabled = enabled;
+    if (!enabled) {
+        mNavigableWhenEnabled = (Flags() & B_NAVIGABLE) != 0;
+        SetFlags(Flags() & ~B_NAVIGABLE);
+        if (IsFocus()) {
+            MakeFocus(false);
+        }
+    } else if (mNavigableWhenEnabled) {
+        SetFlags(Flags() | B_NAVIGABLE);
+    }
     Invalidate();
 }
 

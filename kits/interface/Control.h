@@ -40,6 +40,7 @@ class BControl : public BView, public BInvoker {
     // Redraws, sends nothing.
     virtual void SetValue(int32 value);
     int32 Value() const { return mValue; }
+    // A disabled control cannot have the focus: it is without B_NAVIGABLE as long.
     virtual void SetEnabled(bool enabled);
     bool IsEnabled() const { return mEnabled; }
 
@@ -69,6 +70,7 @@ class BControl : public BView, public BInvoker {
     int32 mValue = B_CONTROL_OFF;
     bool mHasLabel = false;
     bool mEnabled = true;
+    bool mNavigableWhenEnabled = false; // known while it is disabled
     bool mFocusChanging = false;
     bool mTracking = false;
 };

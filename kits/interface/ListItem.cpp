@@ -1,5 +1,7 @@
 #include <ListItem.h>
 
+#include "ControlLook.h"
+
 #include <Font.h>
 #include <InterfaceDefs.h>
 #include <Message.h>
@@ -16,8 +18,6 @@ constexpr char kLevelField[] = "_li_outline_level";
 constexpr char kLabelField[] = "_label";
 
 constexpr float kTextIndent = 4;
-constexpr rgb_color kSelectedBackground = {178, 178, 178, 255};
-constexpr rgb_color kDisabledText = {128, 128, 128, 255};
 
 } // namespace
 
@@ -96,12 +96,12 @@ void BStringItem::DrawItem(BView* owner, BRect frame, bool complete) {
     const rgb_color high = owner->HighColor();
     const rgb_color low = owner->LowColor();
     if (IsSelected() || complete) {
-        const rgb_color background = IsSelected() ? kSelectedBackground : owner->ViewColor();
+        const rgb_color background = IsSelected() ? ControlLook::kSelectedRow : owner->ViewColor();
         owner->SetHighColor(background);
         owner->SetLowColor(background);
         owner->FillRect(frame);
     }
-    owner->SetHighColor(IsEnabled() ? high : kDisabledText);
+    owner->SetHighColor(IsEnabled() ? high : ControlLook::kDisabledText);
     owner->DrawString(mText.c_str(), BPoint(frame.left + kTextIndent, frame.top + mBaselineOffset));
     owner->SetHighColor(high);
     owner->SetLowColor(low);

@@ -3,6 +3,7 @@
 #include "ControlLook.h"
 
 #include <MessageRunner.h>
+#include <Window.h>
 
 #include <algorithm>
 #include <cmath>
@@ -187,12 +188,8 @@ void BScrollBar::SetTarget(BView* target) {
 void BScrollBar::SetTarget(const char* targetName) {
     SetTarget(static_cast<BView*>(nullptr));
     mTargetName = targetName == nullptr ? "" : targetName;
-    const BView* top = this;
-    while (top->Parent() != nullptr) {
-        top = top->Parent();
-    }
-    if (Host() != nullptr && !mTargetName.empty()) {
-        SetTarget(top->FindView(mTargetName.c_str()));
+    if (Window() != nullptr && !mTargetName.empty()) {
+        SetTarget(Window()->FindView(mTargetName.c_str()));
     }
 }
 

@@ -40,8 +40,7 @@ class BScrollBar : public BView {
     // How far a button and a click beside the thumb scroll; 1 and 10 at first.
     void SetSteps(float smallStep, float largeStep);
     void GetSteps(float* smallStep, float* largeStep) const;
-    // Null for none. By name: a view of the tree that the bar belongs to, at once or when that is
-    // attached.
+    // Null for none. By name: a view of the window, at once or when the bar is added to one.
     void SetTarget(BView* target);
     void SetTarget(const char* targetName);
     BView* Target() const { return mTarget; }

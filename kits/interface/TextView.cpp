@@ -3,6 +3,7 @@
 #include "ControlLook.h"
 #include "TextCharacters.h"
 
+#include <Cursor.h>
 #include <Message.h>
 #include <ScrollBar.h>
 #include <ScrollView.h>
@@ -102,6 +103,7 @@ void BTextView::Initialise() {
 
 void BTextView::AttachedToWindow() {
     BView::AttachedToWindow();
+    SetViewCursor(B_CURSOR_I_BEAM);
     LayOut();
 }
 

@@ -95,6 +95,21 @@ TEST_F(Buttons, ThatAreDisabledTakeNothing) {
     EXPECT_EQ(mCatcher.Count(), 0U);
 }
 
+TEST_F(Buttons, ThatAreDisabledCannotHaveTheFocus) {
+    mStage.Locked([&] {
+        mButton->MakeFocus();
+        mButton->SetEnabled(false);
+        EXPECT_FALSE(mButton->IsFocus());
+        EXPECT_EQ(mButton->Flags() & B_NAVIGABLE, 0U);
+        mButton->SetEnabled(true);
+        EXPECT_EQ(mButton->Flags() & B_NAVIGABLE, uint32{B_NAVIGABLE});
+        mButton->SetFlags(mButton->Flags() & ~B_NAVIGABLE);
+        mButton->SetEnabled(false);
+        mButton->SetEnabled(true);
+        EXPECT_EQ(mButton->Flags() & B_NAVIGABLE, 0U) << "it never could";
+    });
+}
+
 TEST_F(Buttons, ShowThatTheyHaveTheFocus) {
     EXPECT_EQ(mStage.CountOf(0x0000E5, BRect(10, 10, 89, 33)), 0);
     mStage.Locked([&] { mButton->MakeFocus(); });
