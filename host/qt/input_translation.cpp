@@ -55,7 +55,7 @@ KeyName key_name(int key) {
     case Qt::Key_Control:
         return KeyName::control;
     case Qt::Key_Alt:
-    case Qt::Key_AltGr:
+        // The right one makes characters on many keyboards and opens no menus.
         return KeyName::alt;
     case Qt::Key_Meta:
     case Qt::Key_Super_L:

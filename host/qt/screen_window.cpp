@@ -132,6 +132,12 @@ void ScreenWindow::appear() {
         PopupStack::instance().push(this);
         return;
     }
+    if (options_.kind == WindowKind::modal || options_.kind == WindowKind::floating) {
+        QWindow* const active = QGuiApplication::focusWindow();
+        if (transientParent() == nullptr && active != this) {
+            setTransientParent(active);
+        }
+    }
     setVisible(true);
     tell_scale();
 }

@@ -1,0 +1,6 @@
+#include "desktop/WindowOnDesktop.h"
+
+test::Desktop& TheDesktop() {
+    static test::Desktop desktop(test::Desktop::WindowManager::none);
+    return desktop;
+}
