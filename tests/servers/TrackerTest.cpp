@@ -1,6 +1,7 @@
 // The program that opens files and folders, launched on demand, with stand-ins for the user's preferred
 // program and file manager.
 #include "AppFiles.h"
+#include "TrackerApp.h"
 #include "support/program.h"
 #include "support/temporary_environment.h"
 
@@ -163,4 +164,14 @@ TEST_F(TrackerTest, AFileThatIsGoneIsSaidSoAndTheNextIsOpened) {
     const test::ProgramResult result = tracker.wait();
     EXPECT_EQ(result.status, 0);
     EXPECT_EQ(result.errors, "tracker: gone.mp3: is not there\n");
+}
+
+TEST_F(TrackerTest, WithoutWorkItEndsByItself) {
+    const bigtime_t begun = system_time();
+    {
+        TrackerApp tracker(300'000);
+        EXPECT_GT(tracker.Run(), 0);
+    }
+    EXPECT_GE(system_time() - begun, 300'000);
+    EXPECT_FALSE(be_roster->IsRunning(kTracker));
 }
