@@ -138,6 +138,18 @@ void ControlLook::CheckMark(BRect rect, ControlState state) {
     }
 }
 
+void ControlLook::RoundMark(BRect square, bool on, ControlState state) {
+    const rgb_color page = state.enabled ? kDocument : kDisabledDocument;
+    mView->SetHighColor(state.enabled && state.pressed ? kPressedPanel : page);
+    mView->FillEllipse(square);
+    mView->SetHighColor(state.enabled ? kDarkFrame : kDisabledFrame);
+    mView->StrokeEllipse(square);
+    if (on) {
+        mView->SetHighColor(TextColor(state));
+        mView->FillEllipse(square.InsetByCopy(4, 4));
+    }
+}
+
 float ControlLook::LineHeight(const BFont& font) {
     font_height height;
     font.GetHeight(&height);

@@ -71,6 +71,8 @@ class ControlLook {
     void Arrow(BRect rect, Direction direction, ControlState state);
     // A tick in the middle of the rectangle.
     void CheckMark(BRect rect, ControlState state);
+    // A ring that fills the square, with a dot when it is on.
+    void RoundMark(BRect square, bool on, ControlState state);
 
     static rgb_color TextColor(ControlState state) { return state.enabled ? kText : kDisabledText; }
     // The baseline, a whole number, that puts a line of this font into the middle of the rectangle's height.

@@ -51,7 +51,7 @@ class BTextControl : public BControl {
     float Divider() const { return mDivider; }
     status_t Invoke(BMessage* message = nullptr) override;
 
-    // For the kit's own use, from the text view: its text, or whether it has the focus, has changed.
+    // For the kit's own use, from the text view: its text, or whether keys go to it, has changed.
     void TextModified();
     void FocusChanged();
 

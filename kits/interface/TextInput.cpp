@@ -49,6 +49,13 @@ void TextInput::MakeFocus(bool focus) {
     mControl->FocusChanged();
 }
 
+void TextInput::WindowActivated(bool active) {
+    BTextView::WindowActivated(active);
+    if (mControl != nullptr) {
+        mControl->FocusChanged();
+    }
+}
+
 void TextInput::KeyDown(const char* bytes, int32 numBytes) {
     const char byte = numBytes == 1 ? *bytes : '\0';
     if (byte == B_RETURN && mControl != nullptr) {

@@ -18,6 +18,7 @@ class TextInput : public BTextView {
     void SetControl(BTextControl* control) { mControl = control; }
 
     void MakeFocus(bool focus = true) override;
+    void WindowActivated(bool active) override;
     void KeyDown(const char* bytes, int32 numBytes) override;
     void FrameResized(float newWidth, float newHeight) override;
 
