@@ -17,6 +17,9 @@ namespace {
 // How long a window may take to end when the application has ended already.
 constexpr bigtime_t kPatience = 3000000;
 
+// How long a window is waited for that is to come to the front.
+constexpr bigtime_t kShortPatience = 200000;
+
 // Windows that the application has left open end with it. They are not asked.
 void QuitAllWindows() {
     for (const std::shared_ptr<LooperState>& state : LooperTable::Instance().All()) {
@@ -68,4 +71,16 @@ bool WindowLoop::Run() {
 void WindowLoop::Quit() {
     QuitAllWindows();
     host::end_display_loop();
+}
+
+void WindowLoop::Activate(const std::string&) {
+    for (const std::shared_ptr<LooperState>& state : LooperTable::Instance().All()) {
+        if (!state->IsOpen() || state->looper == be_app || state->lock.Lock(kShortPatience) != B_OK) {
+            continue;
+        }
+        if (auto* const window = state->IsOpen() ? dynamic_cast<BWindow*>(state->looper) : nullptr) {
+            window->Activate(true);
+        }
+        state->lock.Unlock();
+    }
 }

@@ -15,6 +15,9 @@ class WindowLoop : public MainLoop {
     bool Prepare() override;
     bool Run() override;
     void Quit() override;
+    // Every window that is not hidden, the last made in front. One that is busy stays where it is. The token
+    // is not used yet: a Wayland compositor may only mark the windows instead.
+    void Activate(const std::string& token) override;
 
     // Constructed once, before main().
     WindowLoop();

@@ -4,6 +4,7 @@
 #include "PopUpHost.h"
 #include "support/program.h"
 
+#include <Roster.h>
 #include <Screen.h>
 
 namespace {
@@ -247,6 +248,21 @@ TEST_F(WindowTest, PopUpsHavePointerAndKeysUntilTheyGo) {
         EXPECT_TRUE(TheDesktop().becomes(400, 300, 0x0a14c8));
         TheDesktop().click(320, 380);
         EXPECT_TRUE(mNotes.WaitFor("view: down 20,180 buttons 1 clicks 1"));
+        Close(window);
+    });
+}
+
+TEST_F(WindowTest, AProgramThatIsActivatedBringsItsWindowsBack) {
+    RunApplication([this] {
+        BWindow* const window = Open(BRect(300, 200, 599, 399), "Called", MakeView(), kBlue);
+        EXPECT_TRUE(TheDesktop().becomes(450, 300, 0x0a14c8));
+        ASSERT_TRUE(window->Lock());
+        window->Minimize(true);
+        window->Unlock();
+        EXPECT_TRUE(TheDesktop().becomes(450, 300, 0x000000));
+        // As a second start of the program does it.
+        EXPECT_EQ(be_roster->ActivateApp(be_app->Team()), B_OK);
+        EXPECT_TRUE(TheDesktop().becomes(450, 300, 0x0a14c8));
         Close(window);
     });
 }
