@@ -135,8 +135,9 @@ void ScreenWindow::focusOutEvent(QFocusEvent* /*event*/) {
         // Some window managers give pop-ups the focus; to the program its window stays the active one.
         return;
     }
-    // A pop-up that goes hands the focus back to the window below it; the other pop-ups stay.
-    if (!is_popup() || next == nullptr) {
+    // A pop-up that goes hands the focus back to the window that was active all the time; the others stay.
+    const bool handed_back = is_popup() && next != nullptr && next->active_;
+    if (!handed_back) {
         PopupStack::instance().dismiss();
     }
     if (active_) {
