@@ -21,5 +21,8 @@ InputState current_input(const BView& view) {
     if (message->FindInt32("modifiers", &value) == B_OK) {
         input.modifiers = static_cast<uint32>(value);
     }
+    if (message->FindInt32("raw_char", &value) == B_OK) {
+        input.plainCharacter = static_cast<uint32>(value);
+    }
     return input;
 }

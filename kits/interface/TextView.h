@@ -24,7 +24,8 @@ enum undo_state { B_UNDO_UNAVAILABLE, B_UNDO_TYPING, B_UNDO_CUT, B_UNDO_PASTE, B
 // Keys: arrows, Home, End, Page Up and Down (with Control by words, or to the ends of the text) move the
 // caret, with Shift they select; a double click selects a word, a triple one a line. Cut, copied, pasted and
 // undone is through the messages B_CUT, B_COPY, B_PASTE, B_SELECT_ALL, B_UNDO and B_REDO, which windows send
-// for the usual keys. Text that is dropped is inserted. Thread rule: that of BView.
+// for the usual keys; Control-Y and Control-Shift-Z do again what was undone. Text that is dropped is
+// inserted. Thread rule: that of BView.
 class BTextView : public BView {
   public:
     // `textRect`, in the view's coordinates, says where the text begins and how wide wrapped lines are.
@@ -152,7 +153,7 @@ class BTextView : public BView {
     struct Drag {
         bool active = false;
         int32 clicks = 1;
-    // Whether keys go to it: the focus, in the active window.
+        // Whether keys go to it: the focus, in the active window.
         int32 from = 0;
         int32 to = 0;
     };

@@ -87,6 +87,11 @@ void BTextView::KeyDown(const char* bytes, int32 numBytes) {
          HandleErasing(*bytes, input.modifiers))) {
         return;
     }
+    const bool shift = (input.modifiers & B_SHIFT_KEY) != 0;
+    if (isCommand && (input.plainCharacter == 'y' || (input.plainCharacter == 'z' && shift))) {
+        Redo();
+        return;
+    }
     const std::string_view text(bytes, static_cast<size_t>(std::max(0, numBytes)));
     if (!mEditable || text.empty() || isCommand || !IsAllowed(code_point_at(text, 0))) {
         BView::KeyDown(bytes, numBytes);

@@ -217,6 +217,12 @@ TEST_F(Texts, UndoTakesChangesBackOneByOne) {
     Command(B_REDO);
     EXPECT_EQ(Text(), "abc");
     EXPECT_EQ(Selection(), (Range{3, 3}));
+    Command(B_UNDO);
+    mStage.Key(mView, "y", B_CONTROL_KEY | B_COMMAND_KEY);
+    EXPECT_EQ(Text(), "abc");
+    Command(B_UNDO);
+    mStage.Key(mView, "z", B_CONTROL_KEY | B_COMMAND_KEY | B_SHIFT_KEY);
+    EXPECT_EQ(Text(), "abc");
     SetText("new");
     Command(B_UNDO);
     EXPECT_EQ(Text(), "new") << "what the program has set is not undone";
@@ -286,10 +292,10 @@ TEST_F(Texts, LinesAreKnownByOffsetAndPoint) {
 TEST_F(Texts, TheCaretBlinksWhileTheViewHasTheFocus) {
     SetText("");
     mStage.Redraw();
-    EXPECT_EQ(mStage.CountOf(0x000000, BRect(5, 5, 5, 18)), 14);
+    EXPECT_GE(mStage.CountOf(0x000000, BRect(5, 5, 5, 25)), 12);
     mStage.Locked([&] { mView->Pulse(); });
     mStage.Redraw();
-    EXPECT_EQ(mStage.CountOf(0x000000, BRect(5, 5, 5, 18)), 14) << "it has just moved";
+    EXPECT_GE(mStage.CountOf(0x000000, BRect(5, 5, 5, 25)), 12) << "it has just moved";
     snooze(510000);
     mStage.Locked([&] { mView->Pulse(); });
     mStage.Redraw();
@@ -297,7 +303,7 @@ TEST_F(Texts, TheCaretBlinksWhileTheViewHasTheFocus) {
     mStage.Key(mView, B_HOME);
     mStage.Key(mView, "i");
     mStage.Redraw();
-    EXPECT_GT(mStage.CountOf(0x000000, BRect(5, 5, 20, 18)), 13);
+    EXPECT_GE(mStage.CountOf(0x000000, BRect(5, 5, 20, 25)), 12);
     mStage.Locked([&] {
         mView->SetText("");
         mView->MakeFocus(false);
@@ -323,7 +329,7 @@ TEST_F(Texts, AlignmentMovesTheLines) {
     mStage.Locked([&] {
         EXPECT_EQ(mView->PointAt(0).x, 5);
         mView->SetAlignment(B_ALIGN_RIGHT);
-        EXPECT_EQ(mView->PointAt(1).x, 195);
+        EXPECT_NEAR(mView->PointAt(1).x, 195, 0.01);
         mView->SetAlignment(B_ALIGN_CENTER);
         EXPECT_NEAR(mView->PointAt(0).x, 96, 5);
         EXPECT_EQ(mView->OffsetAt(BPoint(mView->PointAt(1).x, 6)), 1);

@@ -75,6 +75,7 @@ class ViewStage : private ViewHost {
         BMessage message(B_KEY_DOWN);
         message.AddString("bytes", bytes.c_str());
         message.AddInt32("modifiers", static_cast<int32>(modifiers));
+        message.AddInt32("raw_char", static_cast<uint8>(bytes[0]));
         Send(view, message);
     }
     void Key(BView* view, char byte, uint32 modifiers = 0) { Key(view, std::string(1, byte), modifiers); }
