@@ -1,64 +1,23 @@
 #include "app/QuirnelApp.h"
 
-#include "metadata/MusicAttributes.h"
+#include "app/AppMessages.h"
+#include "indexing/FileIndexWindow.h"
+#include "indexing/UnattendedJobs.h"
 
-#include <InterfaceDefs.h>
+#include <Alert.h>
+#include <IndexMaintenance.h>
+#include <Menu.h>
+#include <MenuItem.h>
 #include <Message.h>
 #include <MimeType.h>
-#include <TypeConstants.h>
-#include <Volume.h>
 #include <VolumeRoster.h>
-#include <fs_index.h>
 
 #include <cstdio>
-#include <cstring>
 
 QuirnelApp* brindle_app = nullptr;
 
-namespace {
-
-constexpr char kMP3Type[] = "audio/x-mpeg";
-
-struct AttributeIndex {
-    const char* attribute;
-    type_code type;
-};
-
-constexpr AttributeIndex kIndices[] = {
-    {kAttributeSongname, B_STRING_TYPE}, {kAttributeArtist, B_STRING_TYPE},
-    {kAttributeAlbum, B_STRING_TYPE},    {kAttributeChannels, B_INT32_TYPE},
-    {kAttributeDisc, B_STRING_TYPE},     {kAttributeVersion, B_STRING_TYPE},
-};
-
-struct Column {
-    const char* attribute;
-    const char* title;
-    long width;
-};
-
-// All columns are declared as texts, the number of channels too, and the play time is the one in
-// microseconds.
-constexpr Column kColumns[] = {
-    {kAttributeSongname, "Songname", 150},  {kAttributeArtist, "Artist", 150},
-    {kAttributeAlbum, "Album", 150},        {kAttributeTrackNo, "TrackNo", 50},
-    {kAttributeDisc, "Disc", 50},           {kAttributeVersion, "Version", 100},
-    {kAttributeLengthUsec, "Playtime", 50}, {kAttributeSamplerate, "Samplerate", 50},
-    {kAttributeBitrate, "Bitrate", 50},     {kAttributeChannels, "Channels", 50},
-    {kAttributeEncoder, "Encoder", 50},
-};
-
-bool ListsAttribute(const BMessage& attributeInfo, const char* attributeName) {
-    const char* listed = nullptr;
-    for (int32 i = 0; attributeInfo.HasString("attr:name", i); ++i) {
-        if (attributeInfo.FindString("attr:name", i, &listed) == B_OK && strcmp(listed, attributeName) == 0)
-            return true;
-    }
-    return false;
-}
-
-} // namespace
-
-QuirnelApp::QuirnelApp() : BApplication(kQuirnelSignature) {
+QuirnelApp::QuirnelApp()
+    : BApplication(kQuirnelSignature), mJobsWithoutWindow(std::make_unique<UnattendedJobs>()) {
     BMimeType type(kQuirnelSignature);
     if (type.InitCheck() != B_OK)
         printf("Hmm, error!\n");
@@ -66,54 +25,102 @@ QuirnelApp::QuirnelApp() : BApplication(kQuirnelSignature) {
         type.Install();
 }
 
-QuirnelApp::~QuirnelApp() = default;
-
-status_t QuirnelApp::CheckCreateIndices() {
-    if (!mVolumeRoster)
-        mVolumeRoster = std::make_unique<BVolumeRoster>();
-    // Not rewound first, on purpose.
-    BVolume volume;
-    while (mVolumeRoster->GetNextVolume(&volume) == B_OK) {
-        if (volume.KnowsAttr() && volume.KnowsQuery())
-            CreateIndices(&volume);
-    }
-    return 0;
+QuirnelApp::~QuirnelApp() {
+    mJobsWithoutWindow.reset();
+    // What the jobs have changed is in the index before the program ends.
+    close_indices();
 }
 
-status_t QuirnelApp::CreateIndices(BVolume* volume) {
-    const dev_t device = volume->Device();
-    // An index that exists already is refused, and so stays as it is.
-    for (const AttributeIndex& index : kIndices)
-        fs_create_index(device, index.attribute, index.type, 0);
-    return 0;
-}
-
-status_t QuirnelApp::CheckTrackerDisplayAttributes() {
-    BMimeType type(kMP3Type);
-    if (!type.IsInstalled())
-        type.Install();
-    BMessage attributeInfo;
-    type.GetAttrInfo(&attributeInfo);
-    // No field is ever called so: AddToMsg() is what keeps attributes from being listed twice.
-    if (!attributeInfo.HasString(kAttributeSongname, 0)) {
-        for (const Column& column : kColumns)
-            AddToMsg(&attributeInfo, column.attribute, column.title, B_STRING_TYPE, column.width,
-                     B_ALIGN_LEFT);
-    }
-    type.SetAttrInfo(&attributeInfo);
-    return 0;
-}
-
-void QuirnelApp::AddToMsg(BMessage* attributeInfo, const char* attributeName, const char* publicName,
-                          long type, long width, long alignment) {
-    if (ListsAttribute(*attributeInfo, attributeName))
+void QuirnelApp::ReadyToRun() {
+    CheckTrackerDisplayAttributes();
+    CheckCreateIndices();
+    if (LoadPreferences(static_cast<BFile*>(nullptr)))
         return;
-    printf("Adding '%s' to Tracker attributes\n", attributeName);
-    attributeInfo->AddString("attr:name", attributeName);
-    attributeInfo->AddString("attr:public_name", publicName);
-    attributeInfo->AddInt32("attr:type", static_cast<int32>(type));
-    attributeInfo->AddBool("attr:viewable", true);
-    attributeInfo->AddBool("attr:editable", true);
-    attributeInfo->AddInt32("attr:width", static_cast<int32>(width));
-    attributeInfo->AddInt32("attr:alignment", static_cast<int32>(alignment));
+    printf("No preferences found...\n");
+    PostMessage(MSG_OPEN_INDEX_WINDOW);
+    PostMessage(MSG_OPEN_FIND_WINDOW);
+}
+
+void QuirnelApp::MessageReceived(BMessage* message) {
+    switch (message->what) {
+    case MSG_OPEN_PLAYLIST_WINDOW:
+        if (!mPlayListWindow.Activate())
+            OpenPlayListWindow(nullptr);
+        break;
+    case MSG_PLAYLIST_WINDOW_CLOSED:
+        mPlayListWindow.Close();
+        break;
+    case MSG_OPEN_FIND_WINDOW:
+        if (!mFindWindow.Activate())
+            OpenFindWindow(nullptr);
+        break;
+    case MSG_FIND_WINDOW_CLOSED:
+        mFindWindow.Close();
+        if (mIndexWindow.IsEmpty())
+            PostMessage(B_QUIT_REQUESTED);
+        break;
+    case MSG_OPEN_INDEX_WINDOW:
+        if (!mIndexWindow.Activate())
+            OpenIndexWindow(nullptr);
+        break;
+    case MSG_INDEX_WINDOW_CLOSED:
+        mIndexWindow.Close();
+        if (mFindWindow.IsEmpty())
+            PostMessage(B_QUIT_REQUESTED);
+        break;
+    default:
+        BApplication::MessageReceived(message);
+    }
+}
+
+// Windows fill their slots themselves, and belong to nobody.
+void QuirnelApp::OpenIndexWindow(BMessage* settings) {
+    new FileIndexWindow(settings);
+}
+
+// The find window and the playlist window have their slots, codes and settings; the windows themselves are
+// not there. The first wish for each is answered by a line on standard output.
+void QuirnelApp::OpenFindWindow(BMessage*) {
+    if (!mToldOfFindWindow)
+        printf("The find window is not there yet\n");
+    mToldOfFindWindow = true;
+}
+
+void QuirnelApp::OpenPlayListWindow(BMessage*) {
+    if (!mToldOfPlayListWindow)
+        printf("The playlist window is not there yet\n");
+    mToldOfPlayListWindow = true;
+}
+
+bool QuirnelApp::QuitRequested() {
+    SavePreferences(static_cast<BFile*>(nullptr));
+    mFindWindow.Close();
+    mIndexWindow.Close();
+    return true;
+}
+
+void QuirnelApp::MaybeQuit() {
+    // The playlist window does not keep the program.
+    if (mFindWindow.IsEmpty() && mIndexWindow.IsEmpty())
+        PostMessage(B_QUIT_REQUESTED);
+}
+
+// The code to open with is not used: both items open the same windows wherever the menu hangs.
+BMenu* QuirnelApp::MakeFileMenu(long, long closeCode) {
+    auto* const menu = new BMenu("File", B_ITEMS_IN_COLUMN);
+    menu->AddItem(new BMenuItem("Find song...", new BMessage(MSG_OPEN_FIND_WINDOW), 'F'));
+    menu->AddItem(new BMenuItem("File indexer, disks...", new BMessage(MSG_OPEN_INDEX_WINDOW), 'D'));
+    menu->AddSeparatorItem();
+    menu->AddItem(new BMenuItem("Close", new BMessage(static_cast<uint32>(closeCode)), 'W'));
+    return menu;
+}
+
+void QuirnelApp::AboutRequested() {
+    // The one button has no label.
+    auto* const alert = new BAlert("",
+                                   "Quirnel 0.9 by the Quirnel developers\n"
+                                   "Contact: see the README that comes with it\n"
+                                   "Freeware",
+                                   "", nullptr, nullptr, B_WIDTH_AS_USUAL, B_INFO_ALERT);
+    alert->Go();
 }

@@ -43,7 +43,7 @@ Program::Program(const std::string& path, const std::vector<std::string>& argume
         dup2(nothing, STDIN_FILENO);
         dup2(output_, STDOUT_FILENO);
         dup2(errors_, STDERR_FILENO);
-        execv(path.c_str(), words.data());
+        execvp(path.c_str(), words.data());
         _exit(127);
     }
 }

@@ -13,7 +13,8 @@ struct ProgramResult {
     std::string errors;
 };
 
-/// A program of the build, started with arguments, its standard input empty and its two outputs kept.
+/// A program of the build, or one found by its name, started with arguments, its standard input empty and its
+/// two outputs kept.
 class Program {
   public:
     Program(const std::string& path, const std::vector<std::string>& arguments);

@@ -1,0 +1,270 @@
+// The settings file. No test here has a display: frames then never lie on the screen and fall back to
+// (0, 0, 400, 150). What a display shows of them is tested in tests/desktop.
+#include "app/QuirnelApp.h"
+
+#include "TrackVolume.h"
+
+#include "support/captured_output.h"
+
+#include <File.h>
+#include <FindDirectory.h>
+#include <Message.h>
+#include <MessageQueue.h>
+#include <Path.h>
+#include <Window.h>
+
+#include <sys/resource.h>
+
+#include <filesystem>
+#include <fstream>
+#include <memory>
+#include <string>
+
+namespace {
+
+BMessage Frame(float x, float y, float width, float height) {
+    BMessage frame;
+    frame.AddFloat("winX", x);
+    frame.AddFloat("winY", y);
+    frame.AddFloat("winWidth", width);
+    frame.AddFloat("winHeight", height);
+    return frame;
+}
+
+class QuirnelAppSettings : public TrackTest {
+  protected:
+    QuirnelAppSettings() {
+        TestVolumes::Instance();
+        mApp = std::make_unique<QuirnelApp>();
+        brindle_app = mApp.get();
+        BPath directory;
+        find_directory(B_COMMON_SETTINGS_DIRECTORY, &directory);
+        mDirectory = directory.Path();
+        std::filesystem::remove_all(Path());
+    }
+    ~QuirnelAppSettings() override {
+        mApp->IndexWindowSlot().Close();
+        std::filesystem::remove_all(Path());
+        mApp.reset();
+        brindle_app = nullptr;
+    }
+
+    std::string Path() const { return mDirectory + "/Quirnel settings"; }
+    bool HasIndexWindow() const { return !mApp->IndexWindowSlot().IsEmpty(); }
+
+    bool LoadFromSettingsFile() { return mApp->LoadPreferences(static_cast<BFile*>(nullptr)); }
+    void SaveToSettingsFile() { mApp->SavePreferences(static_cast<BFile*>(nullptr)); }
+
+    static void Write(const std::string& path, const BMessage& settings) {
+        BFile file(path.c_str(), B_WRITE_ONLY | B_CREATE_FILE | B_ERASE_FILE);
+        ASSERT_EQ(settings.Flatten(&file), B_OK);
+    }
+    static BMessage Read(const std::string& path) {
+        BFile file(path.c_str(), B_READ_ONLY);
+        BMessage settings;
+        EXPECT_EQ(settings.Unflatten(&file), B_OK);
+        off_t size = 0;
+        file.GetSize(&size);
+        EXPECT_EQ(settings.FlattenedSize(), size) << "the file holds the message and nothing else";
+        return settings;
+    }
+
+    std::unique_ptr<QuirnelApp> mApp;
+    std::string mDirectory;
+};
+
+TEST_F(QuirnelAppSettings, AMissingFileIsSilent) {
+    CapturedOutput output;
+    EXPECT_FALSE(LoadFromSettingsFile());
+    EXPECT_EQ(output.text(), "");
+    EXPECT_FALSE(HasIndexWindow());
+}
+
+TEST_F(QuirnelAppSettings, AMissingDirectoryIsTold) {
+    std::filesystem::remove_all(mDirectory);
+    CapturedOutput output;
+    EXPECT_FALSE(LoadFromSettingsFile());
+    EXPECT_EQ(output.text(), "no settings directory found!\n");
+
+    CapturedOutput savingOutput;
+    SaveToSettingsFile();
+    EXPECT_EQ(savingOutput.text(), "SavePreferences: no settings directory found!\n");
+    EXPECT_FALSE(std::filesystem::exists(Path()));
+    std::filesystem::create_directories(mDirectory);
+}
+
+TEST_F(QuirnelAppSettings, AFileThatCannotBeMadeIsTold) {
+    std::filesystem::create_directory(Path());
+    CapturedOutput output;
+    SaveToSettingsFile();
+    EXPECT_EQ(output.text(), "SavePreferences: can't write to settings file '" + Path() + "'\n");
+    EXPECT_TRUE(std::filesystem::is_directory(Path()));
+}
+
+TEST_F(QuirnelAppSettings, AFileThatIsNotOpenIsNeitherReadNorWritten) {
+    CapturedOutput output;
+    BFile none;
+    EXPECT_FALSE(mApp->LoadPreferences(&none));
+    mApp->SavePreferences(&none);
+    EXPECT_EQ(output.text(), "");
+    EXPECT_FALSE(HasIndexWindow());
+}
+
+TEST_F(QuirnelAppSettings, WithoutAWindowAnEmptyMessageIsSaved) {
+    CapturedOutput output;
+    SaveToSettingsFile();
+    EXPECT_EQ(output.text(), "");
+    const BMessage saved = Read(Path());
+    EXPECT_EQ(saved.what, 0u);
+    EXPECT_TRUE(saved.IsEmpty());
+}
+
+TEST_F(QuirnelAppSettings, AnOpenIndexerIsSavedAndReopened) {
+    BMessage settings;
+    BMessage frame = Frame(0, 0, 400, 150);
+    settings.AddMessage("indexwindow", &frame);
+    Write(Path(), settings);
+
+    CapturedOutput output;
+    ASSERT_TRUE(LoadFromSettingsFile());
+    EXPECT_EQ(output.text(), "");
+    EXPECT_TRUE(HasIndexWindow());
+
+    std::filesystem::remove(Path());
+    SaveToSettingsFile();
+    const BMessage saved = Read(Path());
+    EXPECT_EQ(saved.what, 0u);
+    EXPECT_EQ(saved.CountNames(B_ANY_TYPE), 1);
+    BMessage savedFrame;
+    ASSERT_EQ(saved.FindMessage("indexwindow", &savedFrame), B_OK);
+    EXPECT_EQ(savedFrame.what, 0u);
+    EXPECT_EQ(savedFrame.CountNames(B_ANY_TYPE), 4);
+    EXPECT_EQ(savedFrame.GetFloat("winX", -1), 0);
+    EXPECT_EQ(savedFrame.GetFloat("winY", -1), 0);
+    EXPECT_EQ(savedFrame.GetFloat("winWidth", -1), 400);
+    EXPECT_EQ(savedFrame.GetFloat("winHeight", -1), 150);
+}
+
+TEST_F(QuirnelAppSettings, SavingReplacesTheWholeFile) {
+    std::ofstream(Path()) << std::string(100000, 'x');
+    SaveToSettingsFile();
+    EXPECT_TRUE(Read(Path()).IsEmpty());
+}
+
+TEST_F(QuirnelAppSettings, AGivenFileIsReadFromWhereItStands) {
+    const std::string path = Volume() + "/settings";
+    BMessage settings;
+    BMessage frame;
+    settings.AddMessage("indexwindow", &frame);
+    {
+        BFile file(path.c_str(), B_WRITE_ONLY | B_CREATE_FILE);
+        file.Write("before", 6);
+        ASSERT_EQ(settings.Flatten(&file), B_OK);
+    }
+    BFile file(path.c_str(), B_READ_ONLY);
+    file.Seek(6, SEEK_SET);
+
+    EXPECT_TRUE(mApp->LoadPreferences(&file));
+    EXPECT_TRUE(HasIndexWindow());
+    EXPECT_EQ(file.InitCheck(), B_OK);
+}
+
+TEST_F(QuirnelAppSettings, AGivenFileIsWrittenToWhereItStands) {
+    const std::string path = Volume() + "/settings";
+    BFile file(path.c_str(), B_READ_WRITE | B_CREATE_FILE);
+    file.Write("before", 6);
+
+    mApp->SavePreferences(&file);
+
+    EXPECT_EQ(file.InitCheck(), B_OK);
+    EXPECT_FALSE(std::filesystem::exists(Path()));
+    file.Seek(6, SEEK_SET);
+    BMessage saved;
+    EXPECT_EQ(saved.Unflatten(&file), B_OK);
+    EXPECT_TRUE(saved.IsEmpty());
+}
+
+TEST_F(QuirnelAppSettings, NoMessageIsFilledForNull) {
+    mApp->SavePreferences(static_cast<BMessage*>(nullptr));
+}
+
+// Present behaviour: as the find window is not there yet, the indexer opens in its place.
+TEST_F(QuirnelAppSettings, SettingsThatNameNoWindowLeaveAUsableProgram) {
+    Write(Path(), BMessage());
+    CapturedOutput output;
+    EXPECT_TRUE(LoadFromSettingsFile());
+    EXPECT_EQ(output.text(), "The find window is not there yet\n");
+    EXPECT_TRUE(HasIndexWindow());
+}
+
+TEST_F(QuirnelAppSettings, SettingsThatNameTheFindWindowAloneLeaveAUsableProgram) {
+    BMessage settings;
+    BMessage frame = Frame(10, 20, 300, 200);
+    settings.AddMessage("findwindow", &frame);
+    CapturedOutput output;
+    mApp->LoadPreferences(&settings);
+    EXPECT_EQ(output.text(), "The find window is not there yet\n");
+    EXPECT_TRUE(HasIndexWindow());
+}
+
+TEST_F(QuirnelAppSettings, FieldsOfOtherTypesNameNoWindow) {
+    BMessage settings;
+    settings.AddString("indexwindow", "open");
+    settings.AddInt32("findwindow", 1);
+    CapturedOutput output;
+    mApp->LoadPreferences(&settings);
+    EXPECT_EQ(output.text(), "The find window is not there yet\n");
+    EXPECT_TRUE(HasIndexWindow());
+}
+
+TEST_F(QuirnelAppSettings, WhatIsNoMessageCountsAsOneThatNamesNoWindow) {
+    BMessage whole;
+    BMessage frame = Frame(0, 0, 400, 150);
+    whole.AddMessage("indexwindow", &frame);
+    Write(Path(), whole);
+    std::string bytes = test::read_file(Path());
+    const std::string contents[] = {"",
+                                    "x",
+                                    std::string(16, '\0'),
+                                    "no message at all, but longer than the head of one",
+                                    bytes.substr(0, 10),
+                                    bytes.substr(0, bytes.size() - 1),
+                                    bytes.substr(1)};
+    for (const std::string& content : contents) {
+        test::write_file(Path(), content);
+        CapturedOutput output;
+        EXPECT_TRUE(LoadFromSettingsFile()) << content.size();
+        EXPECT_EQ(output.text(), content == contents[0] ? "The find window is not there yet\n" : "");
+        EXPECT_TRUE(HasIndexWindow());
+        mApp->IndexWindowSlot().Close();
+    }
+}
+
+TEST_F(QuirnelAppSettings, AHugeFileTakesNeitherTimeNorMemory) {
+    const auto peak = [] {
+        rusage usage{};
+        getrusage(RUSAGE_SELF, &usage);
+        return usage.ru_maxrss;
+    };
+    // The first window of the process has its price.
+    Write(Path(), BMessage());
+    EXPECT_TRUE(LoadFromSettingsFile());
+    mApp->IndexWindowSlot().Close();
+    constexpr char kHead[] = {'B', 'K', 'M', 1, 0, 0, 0x40, 6, 0, 0, 0, 0, 1, 0, 0, 0};
+    for (const std::string& head : {std::string(), std::string(kHead, sizeof(kHead))}) {
+        test::write_file(Path(), head);
+        std::filesystem::resize_file(Path(), 0x6400000);
+        const long before = peak();
+        EXPECT_TRUE(LoadFromSettingsFile());
+        EXPECT_LT(peak() - before, 20 * 1024) << "kilobytes";
+        EXPECT_TRUE(HasIndexWindow());
+        mApp->IndexWindowSlot().Close();
+    }
+}
+
+TEST_F(QuirnelAppSettings, ADirectoryInTheFilesPlaceIsNoTrouble) {
+    std::filesystem::create_directory(Path());
+    LoadFromSettingsFile();
+}
+
+} // namespace
