@@ -6,6 +6,7 @@
 
 #include <Roster.h>
 #include <Screen.h>
+#include <csignal>
 
 namespace {
 
@@ -274,6 +275,15 @@ TEST_F(WindowTest, TheScreenHasTheSizeOfTheDisplay) {
         EXPECT_TRUE(screen.IsValid());
         EXPECT_EQ(screen.SetToNext(), B_ERROR);
     });
+}
+
+TEST_F(WindowTest, ARequestOfTheSystemToEndIsFollowed) {
+    test::Program program(WINDOW_PROGRAM, {});
+    ASSERT_NE(TheDesktop().window("Window program"), "");
+    program.signal(SIGTERM);
+    const test::ProgramResult result = program.wait();
+    EXPECT_EQ(result.status, 0) << result.errors;
+    EXPECT_EQ(result.signal, 0);
 }
 
 TEST_F(WindowTest, WithoutADisplayTheProgramEndsWithOneLine) {

@@ -41,6 +41,12 @@ class WindowTest : public testing::Test {
         input.name = name;
         return input;
     }
+    // What was noted, without the activation that the display may bring at any time.
+    std::vector<std::string> Heard() {
+        std::vector<std::string> lines = mNotes.Take();
+        std::erase_if(lines, [](const std::string& line) { return line.ends_with("active"); });
+        return lines;
+    }
     static WindowEvents& EventsOf(BWindow* window) { return window->Host()->Events(); }
 
     test::TemporaryEnvironment mEnvironment;
@@ -127,9 +133,8 @@ TEST_F(WindowTest, TheMouseGoesToTheViewUnderIt) {
         EventsOf(window).pointer(press);
         EventsOf(window).pointer(Pointer(Kind::released, 20, 130, 0));
         ASSERT_TRUE(mNotes.WaitFor("lower: up"));
-        EXPECT_EQ(mNotes.Take(),
-                  (std::vector<std::string>{"upper: moved 0", "upper: moved 2", "lower: moved 0",
-                                            "lower: down 20,30 buttons 1 clicks 2", "lower: up"}));
+        EXPECT_EQ(Heard(), (std::vector<std::string>{"upper: moved 0", "upper: moved 2", "lower: moved 0",
+                                                     "lower: down 20,30 buttons 1 clicks 2", "lower: up"}));
         CloseWindow(window);
     });
 }
@@ -334,7 +339,7 @@ TEST_F(WindowTest, ADroppedMessageFollowsTheButton) {
         drag.buttons = 0;
         EventsOf(window).drag(drag);
         ASSERT_TRUE(mNotes.WaitFor("lower: dropped"));
-        EXPECT_EQ(mNotes.Take(),
+        EXPECT_EQ(Heard(),
                   (std::vector<std::string>{"upper: moved 0 dragging", "upper: moved 2 dragging",
                                             "lower: moved 0 dragging", "lower: up", "lower: dropped"}));
         CloseWindow(window);
