@@ -5,8 +5,8 @@
 
 #include <atomic>
 
-// Made with radio mode and label-from-marked on, as the menu of a menu field wants it. Until it has closed,
-// nobody but the menu itself touches it or its items.
+// In radio mode and with its label from the marked item, unless told otherwise. Until it has closed, nobody
+// but the menu itself touches it or its items.
 class BPopUpMenu : public BMenu {
   public:
     explicit BPopUpMenu(const char* title, bool radioMode = true, bool labelFromMarked = true,
@@ -36,7 +36,7 @@ class BPopUpMenu : public BMenu {
     bool AsyncAutoDestruct() const { return mAutoDestruct; }
 
   protected:
-    // Where Go() was told to open it; below a menu field, where it belongs.
+    // Where Go() was told to open it; one that hangs from an item opens where any menu does.
     BPoint ScreenLocation() override;
 
   private:
