@@ -48,7 +48,7 @@ run_dev() {
 
 # The programs whose code runs in several threads.
 threaded=(test_kits_support test_kits_kernel test_kits_app test_kits_interface test_kits_interface_windows test_host_linux test_host_threads
-          test_host_sqlite test_indexing test_kits_app_races test_kits_kernel_races test_index_write_fault test_kits_app_processes
+          test_host_sqlite test_indexing test_closing_races test_kits_app_races test_kits_kernel_races test_index_write_fault test_kits_app_processes
           test_host_transport)
 
 run_tsan() {
@@ -74,7 +74,7 @@ fi
 step "tests under AddressSanitizer and UndefinedBehaviorSanitizer" run_dev
 step "tests under ThreadSanitizer" run_tsan
 step "fuzzers" run_fuzzers
-step "the tour, as ./run.sh shows it" ./run.sh
+step "the tour, as ./run.sh shows it without a display" env -u DISPLAY -u WAYLAND_DISPLAY ./run.sh
 
 python3 tests/support/count_results.py "$results"
 exit $((failures > 0))
