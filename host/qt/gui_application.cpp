@@ -6,6 +6,7 @@
 #include <QGuiApplication>
 
 #include <atomic>
+#include <cerrno>
 #include <mutex>
 #include <string>
 
@@ -45,9 +46,9 @@ void expect_display() {
 }
 
 void make_display_application() {
+    // The desktop knows a program's windows by its name.
     static int argc = 1;
-    static char name[] = "bekits";
-    static char* argv[] = {name, nullptr};
+    static char* argv[] = {program_invocation_short_name, nullptr};
     make_application(argc, argv);
 }
 
