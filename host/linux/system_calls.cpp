@@ -10,11 +10,20 @@
 namespace host {
 
 namespace {
-SystemCalls real_system_calls;
-}
+
+// Never destroyed: threads that end late still use it.
+union RealSystemCalls {
+    constexpr RealSystemCalls() : calls() {}
+    ~RealSystemCalls() {}
+    SystemCalls calls;
+};
+
+constinit RealSystemCalls real_system_calls;
+
+} // namespace
 
 namespace internal {
-std::atomic<SystemCalls*> installed_system_calls{&real_system_calls};
+std::atomic<SystemCalls*> installed_system_calls{&real_system_calls.calls};
 }
 
 int SystemCalls::openat(int directory, const char* path, int flags, mode_t mode) {

@@ -1,9 +1,12 @@
 #include "host/sqlite/volume_index.h"
 #include "host/api/threads.h"
+#include "host/linux/opening.h"
+#include "host/linux/volume_table.h"
 #include <algorithm>
 #include <cerrno>
 #include <chrono>
 #include <sys/stat.h>
+#include <unistd.h>
 
 namespace host {
 namespace {
@@ -43,11 +46,20 @@ VolumeIndex::~VolumeIndex() {
     readers_.clear();
     MutexLock lock(mutex_);
     if (store_.is_open() && dirty_ && !lost_changes_ && !found_unclean_ && !is_suspect_locked() &&
-        !slots_.others_alive())
+        !slots_.others_alive() && volume_is_written())
         (void)store_.set_meta("clean", 1);
     store_.close();
     queue_.show_in(nullptr);
     slots_.close();
+}
+
+// What still waits in memory goes with a device that is pulled out, and rows that tell of it would be wrong.
+bool VolumeIndex::volume_is_written() const {
+    const Result<Descriptor> root = VolumeTable::instance().open_root(device_);
+    if (!root)
+        return false;
+    const Result<Descriptor> readable = reopen_directory(root->get());
+    return readable && ::syncfs(readable->get()) == 0;
 }
 
 bool VolumeIndex::open_store_locked() {

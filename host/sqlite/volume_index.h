@@ -89,6 +89,8 @@ class VolumeIndex {
     void mark_incomplete_locked() REQUIRES(mutex_);
     bool is_complete();
     /// A process died that may have had changes left to write: rows are checked before they are relied upon.
+    /// Waits until everything that was changed on the volume is on its device.
+    bool volume_is_written() const;
     void mark_suspect_locked() REQUIRES(mutex_);
     bool is_suspect_locked() REQUIRES(mutex_);
     /// True when a process was found dead just now; the index is suspect from then on.
