@@ -158,19 +158,21 @@ TEST_F(WindowTest, GetMouseTakesTheMessagesThatWait) {
     RunApplication([this] {
         NotingWindow* const window = OpenWindow();
         mNotes.Take();
-        ASSERT_TRUE(window->Lock());
-        EventsOf(window).pointer(Pointer(Kind::moved, 33, 44, 1));
-        EventsOf(window).pointer(Pointer(Kind::released, 35, 46, 0));
-        BView* const view = window->FindView("upper");
-        BPoint where;
-        uint32 buttons = 0;
-        view->GetMouse(&where, &buttons, true);
-        EXPECT_EQ(where, BPoint(33, 44));
-        EXPECT_EQ(buttons, 1U);
-        view->GetMouse(&where, &buttons, true);
-        EXPECT_EQ(where, BPoint(35, 46));
-        EXPECT_EQ(buttons, 0U);
-        window->Unlock();
+        window->work = [window] {
+            EventsOf(window).pointer(Pointer(Kind::moved, 33, 44, 1));
+            EventsOf(window).pointer(Pointer(Kind::released, 35, 46, 0));
+            BView* const view = window->FindView("upper");
+            BPoint where;
+            uint32 buttons = 0;
+            view->GetMouse(&where, &buttons, true);
+            EXPECT_EQ(where, BPoint(33, 44));
+            EXPECT_EQ(buttons, 1U);
+            view->GetMouse(&where, &buttons, true);
+            EXPECT_EQ(where, BPoint(35, 46));
+            EXPECT_EQ(buttons, 0U);
+        };
+        window->PostMessage('work');
+        ASSERT_TRUE(mNotes.WaitFor("window: worked"));
         snooze(50000);
         EXPECT_EQ(mNotes.Count("upper: up"), 0) << "what GetMouse() has taken does not come again";
         CloseWindow(window);

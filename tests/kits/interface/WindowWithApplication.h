@@ -120,6 +120,11 @@ class NotingWindow : public BWindow {
             mNotes.Add("window: test");
             return;
         }
+        if (message->what == 'work' && work) {
+            work();
+            mNotes.Add("window: worked");
+            return;
+        }
         BWindow::MessageReceived(message);
     }
     void FrameResized(float width, float height) override {
@@ -136,6 +141,9 @@ class NotingWindow : public BWindow {
         return true;
     }
     int Dispatched() const { return mDispatched; }
+
+    // Done in the window's thread when the message 'work' comes. Set before it is posted.
+    std::function<void()> work;
 
   private:
     Notes& mNotes;
