@@ -63,7 +63,8 @@ class Disturber {
                 break;
             case 7:
                 std::filesystem::remove(path, ignored);
-                std::filesystem::create_symlink("/etc/passwd", path, ignored);
+                // To nothing: other steps write through it.
+                std::filesystem::create_symlink("nowhere", path, ignored);
                 break;
             }
             ++mChanges;
