@@ -9,8 +9,8 @@ class MainLoop {
   public:
     virtual ~MainLoop() = default;
 
-    // Called in the thread that called BApplication::Run(), before the application's looper has its own. False
-    // as for Run().
+    // Called in the thread that called BApplication::Run(), before the application's looper has its own.
+    // False as for Run().
     virtual bool Prepare() { return true; }
     // Called in that thread, too. Returns after Quit(), also when that came first.
     // False when it cannot work (no display); the reason has been printed then, and the application's

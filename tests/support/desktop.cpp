@@ -92,7 +92,8 @@ Desktop::Desktop(WindowManager manager) {
         // It tells the root window when it is there.
         for (int i = 0; i < 200 && tool({"get_num_desktops"}).empty(); ++i)
             pause_for(50);
-        // It tells so before it is ready, and a window that comes between waits for the next event to be seen.
+        // It tells so before it is ready, and a window that comes between waits for the next event to be
+        // seen.
         pause_for(1000);
     }
     works_ = true;
