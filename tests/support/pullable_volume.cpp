@@ -12,13 +12,23 @@ namespace {
 constexpr unsigned long kShutDown = _IOR('X', 125, std::uint32_t);
 constexpr std::uint32_t kWritingTheJournal = 1;
 
+// Whoever looks over all mounted volumes at this moment holds one of them for an instant.
+bool unmount_patiently(LoopVolume& volume) {
+    for (int attempt = 0; attempt < 50; ++attempt) {
+        if (volume.unmount())
+            return true;
+        ::usleep(100'000);
+    }
+    return false;
+}
+
 } // namespace
 
 PullableVolume::PullableVolume(int megabytes)
     : device_("ext4", megabytes + megabytes / 2 + 16), volume_("ext4", megabytes, "", "", device_.path()) {}
 
 bool PullableVolume::mount_afresh() {
-    return volume_.unmount() && volume_.mount();
+    return unmount_patiently(volume_) && volume_.mount();
 }
 
 bool PullableVolume::pull() {
@@ -31,7 +41,7 @@ bool PullableVolume::pull() {
 }
 
 bool PullableVolume::put_back() {
-    return volume_.unmount() && device_.unmount() && device_.mount() && volume_.mount();
+    return unmount_patiently(volume_) && unmount_patiently(device_) && device_.mount() && volume_.mount();
 }
 
 } // namespace test

@@ -4,6 +4,7 @@
 
 #include <Application.h>
 #include <List.h>
+#include <algorithm>
 
 #include <csignal>
 #include <fstream>
@@ -174,8 +175,12 @@ TEST_F(LaunchTest, ASecondStartHandsItsArgumentsOverAndEndsWell) {
     EXPECT_EQ(test::run_program(TEST_PEER, {}).status, 0);
     BMessage reply;
     ASSERT_EQ(first.Messenger().SendMessage('echo', &reply), B_OK);
-    EXPECT_EQ(Logged(), (Lines{"ready", "argv -x two words", "activated", "runs already", "relaunched",
-                               "activated", "runs already"}));
+    // What the second one says of itself, it says while the first one hears of it.
+    Lines firstSays = Logged();
+    const auto ofSecond = std::remove(firstSays.begin(), firstSays.end(), "runs already");
+    EXPECT_EQ(firstSays.end() - ofSecond, 2);
+    firstSays.erase(ofSecond, firstSays.end());
+    EXPECT_EQ(firstSays, (Lines{"ready", "argv -x two words", "activated", "relaunched", "activated"}));
     EXPECT_EQ(be_roster->TeamFor(kPeer), first.Team());
 }
 
@@ -202,11 +207,12 @@ TEST_F(LaunchTest, OfTwoThatStartAtOnceExactlyOneRuns) {
 TEST_F(LaunchTest, AStartWhileTheOtherEndsRuns) {
     Install(kPeer, "exclusive");
     for (int round = 0; round < 10; round++) {
-        test::write_file(LogPath(), "");
         PeerProgram first(kPeer);
         // Handed over to one that quits, a start may be lost; begun after its end, it may not.
         first.Process().signal(SIGKILL);
         first.Process().wait();
+        // What the first one has logged says nothing of the second.
+        test::write_file(LogPath(), "");
         PeerProgram second(kPeer);
         EXPECT_TRUE(Eventually([&] { return HasLogged("ready"); }));
         EXPECT_EQ(second.Messenger().SendMessage(B_QUIT_REQUESTED), B_OK);
