@@ -128,7 +128,8 @@ class BMenu : public BView {
     void SetTrackingHook(menu_tracking_hook hook, void* state);
 
     // For menus whose items are found out when they open. Called with B_INITIAL_ADD, then, as long as the
-    // answer is true, with B_PROCESSING; with B_ABORT instead when the user has left before the end.
+    // answer is true, with B_PROCESSING. The menu opens after that, so nobody can leave it before the end and
+    // B_ABORT is not sent yet.
     enum add_state { B_INITIAL_ADD, B_PROCESSING, B_ABORT };
     virtual bool AddDynamicItem(add_state state);
 
