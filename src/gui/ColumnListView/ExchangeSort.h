@@ -1,9 +1,10 @@
-// The order that an exchange sort makes, at the cost of a merge sort.
+// The order that an exchange sort makes.
 #pragma once
 
 #include <SupportDefs.h>
 
 #include <algorithm>
+#include <cstddef>
 #include <utility>
 #include <vector>
 
@@ -11,9 +12,12 @@
 // compare equal do not keep their order: [2a, 2b, 1] becomes [1, 2b, 2a]. `compare(a, b)` is positive when a
 // is to stand behind b; it need not be consistent.
 template <typename Item, typename Compare>
-void ExchangeSort(std::vector<Item>& items, Compare compare);
-
-// The same result in O(n log n) comparisons when `compare` is a consistent ordering; when it is found not to
-// be, ExchangeSort() itself is run. Small inputs always are.
-template <typename Item, typename Compare>
-void SortLikeExchange(std::vector<Item>& items, Compare compare);
+void ExchangeSort(std::vector<Item>& items, Compare compare) {
+    for (size_t i = 0; i + 1 < items.size(); ++i) {
+        for (size_t j = i + 1; j < items.size(); ++j) {
+            if (compare(items[i], items[j]) > 0) {
+                std::swap(items[i], items[j]);
+            }
+        }
+    }
+}
