@@ -1,12 +1,10 @@
 #include <ListView.h>
 
 #include "ControlLook.h"
-#include "ListAutoscroll.h"
 #include "RowPositions.h"
 
 #include <Looper.h>
 #include <Message.h>
-#include <MessageRunner.h>
 #include <ScrollBar.h>
 #include <ScrollView.h>
 
@@ -90,7 +88,7 @@ void BListView::AttachedToWindow() {
 }
 
 void BListView::DetachedFromWindow() {
-    EndPress();
+    mPress = Press();
     BView::DetachedFromWindow();
 }
 
@@ -164,10 +162,6 @@ void BListView::DrawItem(BListItem* item, BRect frame, bool complete) {
 void BListView::MessageReceived(BMessage* message) {
     if (message->what == B_SELECT_ALL && mType == B_MULTIPLE_SELECTION_LIST) {
         Select(0, CountItems() - 1);
-        return;
-    }
-    if (message->what == kListAutoscroll) {
-        Autoscroll();
         return;
     }
     BView::MessageReceived(message);

@@ -1,0 +1,50 @@
+// A song's row in the playlist and among the songs that were found.
+#pragma once
+
+#include "gui/ColumnListView/CLVListItem.h"
+
+#include <EntryRef.h>
+#include <GraphicsDefs.h>
+
+#include <memory>
+
+class BrindleMetaData;
+
+// The columns of the list, in the order in which they are added, and its sort keys.
+enum PlayListColumn : int32 {
+    kColumnCover,
+    kColumnTrackNo,
+    kColumnTime,
+    kColumnSongname,
+    kColumnArtist,
+    kColumnAlbum
+};
+
+// Owns the file's metadata, which it reads once, when it is made. Thread rule: that of BListItem.
+class PlayListItem : public CLVListItem {
+  public:
+    // Tags the file from its and its folder's name where it has no attributes.
+    explicit PlayListItem(entry_ref* ref);
+    ~PlayListItem() override;
+
+    // Copies the file's reference.
+    void GetRef(entry_ref* out) const;
+    const BrindleMetaData& MetaData() const { return *mMetaData; }
+
+    void DrawItemColumn(BView* owner, BRect columnRect, int32 columnIndex, bool complete) override;
+    void Update(BView* owner, const BFont* font) override;
+
+    // For ColumnListView::SetSortFunction(); both rows must be PlayListItems. Texts compare byte by byte.
+    // Track numbers do so within their albums, as texts. Play times compare by the low 32 bits of their
+    // difference in microseconds, on purpose.
+    static int CompareFunc(const CLVListItem* a, const CLVListItem* b, long sortKey);
+
+  private:
+    void DrawCovers(BView* owner, BRect rect) const;
+    // Null for a column without text.
+    const char* TextOf(int32 columnIndex) const;
+
+    std::unique_ptr<BrindleMetaData> mMetaData;
+    // From the row's top to the baseline of its texts.
+    float mTextOffset = 0;
+};
