@@ -168,7 +168,7 @@ class BView : public BHandler {
 
     // In drawing coordinates; null takes the limit of this state away.
     virtual void ConstrainClippingRegion(BRegion* region);
-    // What is visible and not clipped, in view coordinates.
+    // What is visible and not clipped, in view coordinates; in Draw(), of what is drawn anew.
     void GetClippingRegion(BRegion* region) const;
 
     float StringWidth(const char* string) const;

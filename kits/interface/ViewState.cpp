@@ -188,6 +188,12 @@ void BView::GetClippingRegion(BRegion* region) const {
         return;
     }
     *region = VisibleRegion(Covered::WithoutChildren);
+    if (const BRegion* const limit = mHost == nullptr ? nullptr : mHost->DrawingLimit(); limit != nullptr) {
+        BRegion updated = *limit;
+        const BPoint origin = ConvertToSurface(B_ORIGIN);
+        updated.OffsetBy(-to_pixel_coordinate(origin.x), -to_pixel_coordinate(origin.y));
+        region->IntersectWith(&updated);
+    }
     if (const std::optional<BRegion> own = mState->CombinedClip(); own) {
         region->IntersectWith(&*own);
     }

@@ -1,4 +1,5 @@
 #include "BitmapWithView.h"
+#include "ViewStage.h"
 
 #include <Message.h>
 
@@ -236,6 +237,27 @@ TEST(View, WithoutAHostInputIsIdle) {
     view.Invalidate();
     view.Sync();
     view.Flush();
+}
+
+TEST(View, WhileItDrawsOnlyWhatIsDrawnAnewCanBeDrawnOn) {
+    class Noting : public BView {
+      public:
+        using BView::BView;
+        void Draw(BRect) override { GetClippingRegion(&region); }
+        BRegion region;
+    };
+    ViewStage stage(100, 80);
+    auto* const view = new Noting(BRect(10, 10, 59, 59), "view", B_FOLLOW_NONE, B_WILL_DRAW);
+    stage.Add(view);
+    stage.Locked([&] { view->ScrollTo(0, 100); });
+    stage.Redraw();
+    stage.Locked([&] { view->Invalidate(BRect(5, 110, 14, 119)); });
+
+    stage.Redraw();
+
+    EXPECT_EQ(view->region.Frame(), BRect(5, 110, 14, 119));
+    stage.Locked([&] { view->GetClippingRegion(&view->region); });
+    EXPECT_EQ(view->region.Frame(), BRect(0, 100, 49, 149));
 }
 
 } // namespace
