@@ -4,7 +4,6 @@
 #include "gui/ColumnListView/CLVListItem.h"
 
 #include <memory>
-#include <string>
 #include <vector>
 
 class BBitmap;
@@ -23,7 +22,8 @@ class CLVEasyItem : public CLVListItem {
     // here.
     virtual void SetColumnContent(int column_index, const BBitmap* bitmap, float horizontal_offset = 2.0F,
                                   bool copy = true);
-    // The whole text, null when the cell holds none; the same for a picture.
+    // The whole text, null when the cell holds none; the same for a picture. The row's, until the cell's
+    // content changes.
     const char* GetColumnContentText(int column_index) const;
     const BBitmap* GetColumnContentBitmap(int column_index) const;
 
@@ -39,13 +39,16 @@ class CLVEasyItem : public CLVListItem {
   private:
     struct Cell;
 
-    // The part of the cell that changes when its text is shortened for this width; invalid when none does or
-    // it was never drawn.
-    BRect TruncateText(Cell& cell, float column_width) const;
-    Cell& CellFor(int column_index);
+    // Shortens the cell's text for this width; answers the part of `frame`, where the cell is, that changes
+    // with it, invalid (-1, -1, -1, -1) when none does or it was never drawn.
+    static BRect TruncateText(Cell& cell, BRect frame, float column_width);
+    // Null for a negative index; makes room for others.
+    Cell* CellFor(int column_index);
+    // Null where nothing was ever set.
+    Cell* FindCell(int column_index);
     const Cell* FindCell(int column_index) const;
-    void DrawText(BView* owner, BRect rect, Cell& cell);
-    void DrawPicture(BView* owner, BRect rect, const Cell& cell);
+    void DrawText(BView* owner, BRect rect, Cell& cell) const;
+    void MoveCells(Cell& resized, float column_width);
 
     std::vector<Cell> mCells;
     float mTextOffset = 0;

@@ -42,7 +42,7 @@ class CLVListItem : public BListItem {
     // Where the arrow, and the expander's cell, were last drawn; invalid (-1, -1, -1, -1) when they were not.
     BRect ExpanderButtonRect() const { return mExpanderButtonRect; }
     BRect ExpanderColumnRect() const { return mExpanderColumnRect; }
-    // Draws the expander's cell and the arrow over it, where the row was last drawn. For the list.
+    // Draws the expander's cell and the arrow over it at once, where they are now. For the list.
     void RedrawExpander(ColumnListView* owner);
 
     // For the list's bookkeeping alone.
@@ -50,7 +50,8 @@ class CLVListItem : public BListItem {
     const OutlinePlace& PlaceInOutline() const { return mPlace; }
 
   private:
-    void DrawExpander(ColumnListView* list, BRect item_rect, BRect cell, float columnEnd, float shift);
+    // `end`: where the expander's cell would end if nothing cut it off.
+    void DrawArrow(ColumnListView* list, BRect cell, float end);
 
     bool mSuperItem;
     uint32 mOutlineLevel;
