@@ -4,8 +4,10 @@
 #include "ControlLook.h"
 #include "host/api/display.h"
 
+#include <Application.h>
 #include <Button.h>
 #include <Invoker.h>
+#include <MessageQueue.h>
 #include <Screen.h>
 #include <ThreadSafety.h>
 
@@ -31,6 +33,10 @@ constexpr char kWhichField[] = "which";
 
 // How often a window that waits for its alert is asked whether it has something to draw.
 constexpr bigtime_t kUpdateInterval = 25000;
+
+bool IsAskedToQuit(const BLooper& looper) {
+    return looper.MessageQueue()->FindMessage(B_QUIT_REQUESTED) != nullptr;
+}
 
 } // namespace
 
@@ -203,7 +209,9 @@ BButton* BAlert::ButtonAt(int32 index) const {
 int32 BAlert::Go() {
     // The alert may be gone as soon as it is shown.
     const std::shared_ptr<AlertAnswer> answer = mAnswer;
-    auto* const caller = dynamic_cast<BWindow*>(BLooper::LooperForThread(find_thread(nullptr)));
+    BLooper* const looper = BLooper::LooperForThread(find_thread(nullptr));
+    auto* const caller = dynamic_cast<BWindow*>(looper);
+    const BMessenger alert(this);
     if (!host::display_connected()) {
         Quit();
         return B_ERROR;
@@ -215,6 +223,8 @@ int32 BAlert::Go() {
         }
         if (caller != nullptr) {
             caller->UpdateIfNeeded();
+        } else if (looper != nullptr && looper == be_app && IsAskedToQuit(*looper)) {
+            (void)alert.SendMessage(B_QUIT_REQUESTED);
         }
     }
 }

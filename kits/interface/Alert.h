@@ -45,7 +45,8 @@ class BAlert : public BWindow {
     char Shortcut(int32 index) const;
 
     // Shows the alert and waits: the number of the button that was pressed, or B_ERROR when the alert was
-    // closed some other way, or there is no display. In a window's thread it has that window draw meanwhile.
+    // closed some other way, or there is no display. In a window's thread it has that window draw meanwhile;
+    // in the application's thread a request to quit closes it, so that it does not keep the program.
     int32 Go();
     // Shows the alert and returns at once. The answer is sent with the invoker's message, to which "which"
     // (int32), the number of the button, is added; nothing is sent for null, nor when the alert is closed
