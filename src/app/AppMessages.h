@@ -13,35 +13,28 @@ enum : uint32 {
     MSG_FORWARD_102 = 102,
 
     // To the application, which opens the playlist window or brings it to the front. Forwarded by all three
-    // windows.
-    // No menu sends it: it comes from other programs.
+    // windows. No menu sends it: it comes from other programs.
     MSG_OPEN_PLAYLIST_WINDOW = 103,
 
     // From the playlist window's "Close" item, to the application, which closes that window. The playlist
-    // window adds
-    // pointer "winptr", itself, as it forwards the message; the application does not read it.
+    // window adds pointer "winptr", itself, as it forwards the message; the application does not read it.
     MSG_PLAYLIST_WINDOW_CLOSED = 104,
 
     // From the "Find song..." items and the application's start, to the application, which opens the find
-    // window or
-    // brings it to the front. Forwarded by the playlist and indexer windows.
+    // window or brings it to the front. Forwarded by the playlist and indexer windows.
     MSG_OPEN_FIND_WINDOW = 105,
 
     // From the find window's "Close" item, to the application, which closes that window, and quits when there
-    // is no
-    // indexer window. The find window adds pointer "winptr", itself, as it forwards the message; the
-    // application does
-    // not read it.
+    // is no indexer window. The find window adds pointer "winptr", itself, as it forwards the message; the
+    // application does not read it.
     MSG_FIND_WINDOW_CLOSED = 106,
 
     // From the "File indexer, disks..." items and the application's start, to the application, which opens
-    // the indexer
-    // window or brings it to the front. Forwarded by all three windows.
+    // the indexer window or brings it to the front. Forwarded by all three windows.
     MSG_OPEN_INDEX_WINDOW = 107,
 
     // From the indexer window's "Close" item, forwarded to the application, which closes that window, and
-    // quits when
-    // there is no find window.
+    // quits when there is no find window.
     MSG_INDEX_WINDOW_CLOSED = 108,
 
     // From the find window's search field, to the find window, which runs the search.
@@ -54,13 +47,12 @@ enum : uint32 {
     MSG_SELECT_ALL_ROWS = 708,
 
     // From the indexer window's list "volumelist" when its selection changes, to the indexer window, which
-    // updates the
-    // buttons.
+    // updates the buttons.
     MSG_INDEX_SELECTION = 709,
 
     // From the indexer window's buttons "Status", "Strip", "Stop" and "Index", to the indexer window, which
-    // starts the
-    // job on the selected volume or cancels it. A volume's row also keeps its job's state in these values.
+    // starts the job on the selected volume or cancels it. A volume's row also keeps its job's state in these
+    // values.
     MSG_INDEX_STATUS = 710,
     MSG_INDEX_STRIP = 711,
     MSG_INDEX_STOP = 712,
