@@ -45,9 +45,10 @@ class QuirnelApp : public BApplication {
     BMenu* MakeFileMenu(long openCode, long closeCode);
 
     // The settings file holds a frame for each main window that was open. A null file stands for the
-    // settings file itself, which is replaced as a whole; another one is read or written where it stands.
-    // Loading answers whether there was a file. One that holds no settings, or no window, opens the find
-    // window. Says on standard output when there is no directory for settings or the file cannot be made.
+    // settings file itself, which is replaced as a whole or, when the new one cannot be written, stays as it
+    // was; another one is read or written where it stands. Loading answers whether there was a file. One that
+    // holds no settings, or no window, opens the find window. Says on standard output when there is no
+    // directory for settings or the file cannot be written.
     bool LoadPreferences(BFile* file);
     void LoadPreferences(BMessage* settings);
     void SavePreferences(BFile* file);

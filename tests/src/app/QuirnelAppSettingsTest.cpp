@@ -5,6 +5,7 @@
 #include "TrackVolume.h"
 
 #include "support/captured_output.h"
+#include "support/loop_volume.h"
 
 #include <File.h>
 #include <FindDirectory.h>
@@ -80,6 +81,19 @@ TEST_F(QuirnelAppSettings, AMissingFileIsSilent) {
     EXPECT_FALSE(HasIndexWindow());
 }
 
+TEST_F(QuirnelAppSettings, AFileThatCannotBeOpenedIsSilent) {
+    // A link to itself.
+    std::filesystem::create_symlink("Quirnel settings", Path());
+    CapturedOutput output;
+    EXPECT_FALSE(LoadFromSettingsFile());
+    EXPECT_EQ(output.text(), "");
+    EXPECT_FALSE(HasIndexWindow());
+
+    CapturedOutput savingOutput;
+    SaveToSettingsFile();
+    EXPECT_EQ(savingOutput.text(), "SavePreferences: can't write to settings file '" + Path() + "'\n");
+}
+
 TEST_F(QuirnelAppSettings, AMissingDirectoryIsTold) {
     std::filesystem::remove_all(mDirectory);
     CapturedOutput output;
@@ -149,6 +163,52 @@ TEST_F(QuirnelAppSettings, SavingReplacesTheWholeFile) {
     std::ofstream(Path()) << std::string(100000, 'x');
     SaveToSettingsFile();
     EXPECT_TRUE(Read(Path()).IsEmpty());
+}
+
+TEST_F(QuirnelAppSettings, NothingIsLeftBesideTheFile) {
+    // As a program leaves it that was killed at the wrong moment.
+    test::write_file(Path() + ".new", std::string(100000, 'x'));
+    SaveToSettingsFile();
+    EXPECT_TRUE(Read(Path()).IsEmpty());
+    EXPECT_FALSE(std::filesystem::exists(Path() + ".new"));
+}
+
+TEST_F(QuirnelAppSettings, AFileThatLiesElsewhereIsReplacedThere) {
+    const std::string elsewhere = Volume() + "/settings";
+    std::filesystem::create_symlink(elsewhere, Path());
+    SaveToSettingsFile();
+    SaveToSettingsFile();
+    EXPECT_TRUE(std::filesystem::is_symlink(Path()));
+    EXPECT_TRUE(Read(elsewhere).IsEmpty());
+    EXPECT_FALSE(std::filesystem::exists(elsewhere + ".new"));
+}
+
+TEST_F(QuirnelAppSettings, AFullDiskKeepsTheOldSettings) {
+    test::LoopVolume disk("ext4", 4);
+    if (!disk.mounted())
+        GTEST_SKIP() << disk.reason();
+    const std::string file = disk.path() + "/settings";
+    BMessage settings;
+    BMessage frame = Frame(0, 0, 400, 150);
+    settings.AddMessage("indexwindow", &frame);
+    Write(file, settings);
+    std::filesystem::create_symlink(file, Path());
+    ASSERT_TRUE(LoadFromSettingsFile());
+    const std::string before = test::read_file(file);
+    const std::string filler = disk.fill();
+
+    mApp->IndexWindowSlot().UseLocked([](BWindow* window) { window->ResizeTo(500, 300); });
+    CapturedOutput output;
+    SaveToSettingsFile();
+    EXPECT_EQ(output.text(), "SavePreferences: can't write to settings file '" + Path() + "'\n");
+    EXPECT_EQ(test::read_file(file), before);
+    EXPECT_FALSE(std::filesystem::exists(file + ".new"));
+
+    std::filesystem::remove(filler);
+    SaveToSettingsFile();
+    BMessage saved;
+    ASSERT_EQ(Read(file).FindMessage("indexwindow", &saved), B_OK);
+    EXPECT_EQ(saved.GetFloat("winWidth", -1), 500);
 }
 
 TEST_F(QuirnelAppSettings, AGivenFileIsReadFromWhereItStands) {
