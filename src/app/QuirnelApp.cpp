@@ -41,7 +41,18 @@ void QuirnelApp::ReadyToRun() {
     PostMessage(MSG_OPEN_FIND_WINDOW);
 }
 
+// A code about windows, from the program that has launched this one, before the windows of the settings are
+// open: acted upon at once, it would open one of them twice.
+bool QuirnelApp::IsEarly(const BMessage& message) const {
+    return IsRunning() && IsLaunching() && message.what >= MSG_OPEN_PLAYLIST_WINDOW &&
+           message.what <= MSG_INDEX_WINDOW_CLOSED;
+}
+
 void QuirnelApp::MessageReceived(BMessage* message) {
+    if (IsEarly(*message)) {
+        PostMessage(message);
+        return;
+    }
     switch (message->what) {
     case MSG_OPEN_PLAYLIST_WINDOW:
         if (!mPlayListWindow.Activate())

@@ -31,6 +31,7 @@ class QuirnelApp : public BApplication {
     // Prepares file manager and volumes and opens the windows that were open last time; both main windows
     // where nothing is known.
     void ReadyToRun() override;
+    // Codes about windows that come before ReadyToRun() are acted upon after it.
     void MessageReceived(BMessage* message) override;
     // Saves the settings, then closes the main windows without asking them.
     bool QuitRequested() override;
@@ -79,6 +80,7 @@ class QuirnelApp : public BApplication {
                   long width, long alignment);
 
   private:
+    bool IsEarly(const BMessage& message) const;
     // With default frames where `settings` is null.
     void OpenIndexWindow(BMessage* settings);
     void OpenFindWindow(BMessage* settings);
