@@ -1,105 +1,14 @@
-// The indexer window without a display: its rows, buttons and messages, and how it goes. The application
-// object does not run here, so that what it is sent can be looked at. What is seen and clicked is tested in
-// tests/desktop.
-#include "indexing/FileIndexWindow.h"
+// The indexer window's rows, buttons and messages. What is seen and clicked is tested in tests/desktop.
+#include "IndexerWindow.h"
 
-#include "VolumeJobs.h"
-#include "app/QuirnelApp.h"
-#include "indexing/UnattendedJobs.h"
-
-#include "support/captured_output.h"
-
-#include <Autolock.h>
-#include <Button.h>
-#include <ListView.h>
 #include <Menu.h>
 #include <MenuBar.h>
 #include <MenuItem.h>
-#include <MessageQueue.h>
 
-#include <memory>
 #include <string>
 #include <vector>
 
 namespace {
-
-class IndexerWindow : public TrackTest {
-  protected:
-    IndexerWindow() {
-        TestVolumes::Instance();
-        mApp = std::make_unique<QuirnelApp>();
-        brindle_app = mApp.get();
-    }
-    ~IndexerWindow() override {
-        mApp->IndexWindowSlot().Close();
-        mApp.reset();
-        brindle_app = nullptr;
-    }
-
-    void Open(BMessage* settings = nullptr) { mWindow = new FileIndexWindow(settings); }
-    template <typename Use>
-    void WithWindow(Use use) {
-        bool used = false;
-        mApp->IndexWindowSlot().UseLocked([&](BWindow*) {
-            use();
-            used = true;
-        });
-        ASSERT_TRUE(used);
-    }
-    BListView* List() const { return dynamic_cast<BListView*>(mWindow->FindView("volumelist")); }
-    FileIndexListItem* Row(int32 index) const {
-        return dynamic_cast<FileIndexListItem*>(List()->ItemAt(index));
-    }
-    BButton* Button(const char* name) const { return dynamic_cast<BButton*>(mWindow->FindView(name)); }
-    // Which of Status, Strip, Index and Stop can be pressed.
-    std::string Enabled() {
-        std::string enabled;
-        WithWindow([&] {
-            for (const char* name : {"stat", "strip", "index", "stop"})
-                enabled += Button(name)->IsEnabled() ? std::string(name) + " " : "";
-        });
-        return enabled;
-    }
-    // The window has handled all that was posted to it before.
-    void Settle() {
-        BMessage reply;
-        EXPECT_EQ(BMessenger(mWindow).SendMessage('sync', &reply), B_OK);
-    }
-    void Post(uint32 what) {
-        mWindow->PostMessage(what);
-        Settle();
-    }
-    void Select(int32 row) {
-        WithWindow([&] { List()->Select(row); });
-        Settle();
-    }
-    void Pulse() {
-        WithWindow([&] { mWindow->Pulse(); });
-    }
-    int CountSentToApp(uint32 what) const {
-        int count = 0;
-        while (mApp->MessageQueue()->FindMessage(what, count) != nullptr)
-            ++count;
-        return count;
-    }
-    static void MakeFiles(int count) {
-        for (int i = 0; i < count; ++i)
-            MakeFile(std::to_string(i % 20) + "/Artist - " + std::to_string(i) + ".mp3");
-    }
-    static int CountTagged() {
-        int count = 0;
-        for (const auto& entry : std::filesystem::recursive_directory_iterator(Volume()))
-            count += entry.is_regular_file() && RawAttribute(entry.path(), "Audio:Songname").has_value();
-        return count;
-    }
-
-    std::unique_ptr<QuirnelApp> mApp;
-    FileIndexWindow* mWindow = nullptr;
-};
-
-constexpr int32 kMusicRow = 0;
-constexpr int32 kSecondRow = 1;
-constexpr int32 kUnsupportedRow = 4;
 
 TEST_F(IndexerWindow, TellsTheApplicationOfItself) {
     EXPECT_TRUE(mApp->IndexWindowSlot().IsEmpty());
@@ -277,6 +186,20 @@ TEST_F(IndexerWindow, ASecondPressThatComesTooSoonStartsNoSecondJob) {
     Post(712);
 }
 
+TEST_F(IndexerWindow, ButtonsAreThoseOfTheSelectedRowWhileAnotherWorks) {
+    Open();
+    Post(710);
+    Select(kSecondRow);
+    EXPECT_EQ(Enabled(), "strip index ");
+    Pulse();
+    EXPECT_EQ(Enabled(), "strip index ") << "a job at work changes no button";
+    Select(kUnsupportedRow);
+    EXPECT_EQ(Enabled(), "");
+    Select(kMusicRow);
+    EXPECT_EQ(Enabled(), "stop ");
+    Post(712);
+}
+
 TEST_F(IndexerWindow, ButtonsFollowTheRowWhoseJobEndsWhicheverIsSelected) {
     Open();
     Post(713);
@@ -301,67 +224,6 @@ TEST_F(IndexerWindow, PassesTheApplicationsCodesOn) {
         Post(code);
         EXPECT_EQ(CountSentToApp(code), 0) << code;
     }
-}
-
-TEST_F(IndexerWindow, TheCloseBoxStopsAllJobsAndAsksTheApplicationToQuit) {
-    MakeFiles(4000);
-    Open();
-    Post(713);
-    ASSERT_TRUE(WaitUntil([&] { return Row(kMusicRow)->FileCount() > 0; }));
-    Select(kSecondRow);
-    Post(710);
-
-    mWindow->PostMessage(B_QUIT_REQUESTED);
-    ASSERT_TRUE(WaitUntil([&] { return CountSentToApp(B_QUIT_REQUESTED) == 1; }));
-
-    EXPECT_TRUE(mApp->IndexWindowSlot().IsEmpty());
-    EXPECT_EQ(mApp->JobsWithoutWindow().Count(), 0);
-    const int tagged = CountTagged();
-    EXPECT_LT(tagged, 4000);
-    snooze(50000);
-    EXPECT_EQ(CountTagged(), tagged) << "nothing goes on";
-}
-
-TEST_F(IndexerWindow, ClosedByTheApplicationItsJobsGoOn) {
-    MakeFiles(1000);
-    Open();
-    Post(713);
-    ASSERT_TRUE(WaitUntil([&] { return Row(kMusicRow)->FileCount() > 0; }));
-
-    mApp->IndexWindowSlot().Close();
-
-    EXPECT_TRUE(mApp->IndexWindowSlot().IsEmpty());
-    EXPECT_EQ(CountSentToApp(B_QUIT_REQUESTED), 0) << "the window was not asked";
-    EXPECT_EQ(mApp->JobsWithoutWindow().Count(), 1);
-    ASSERT_TRUE(WaitUntil([&] { return mApp->JobsWithoutWindow().Count() == 0; }));
-    EXPECT_EQ(CountTagged(), 1000);
-}
-
-TEST_F(IndexerWindow, TheApplicationsEndStopsJobsThatGoOn) {
-    MakeFiles(4000);
-    Open();
-    Post(713);
-    ASSERT_TRUE(WaitUntil([&] { return Row(kMusicRow)->FileCount() > 0; }));
-    mApp->IndexWindowSlot().Close();
-
-    mApp.reset();
-
-    EXPECT_LT(CountTagged(), 4000);
-    mApp = std::make_unique<QuirnelApp>();
-    brindle_app = mApp.get();
-}
-
-TEST_F(IndexerWindow, TheNextWindowKnowsNothingOfAJobThatGoesOn) {
-    MakeFiles(2000);
-    Open();
-    Post(713);
-    ASSERT_TRUE(WaitUntil([&] { return Row(kMusicRow)->FileCount() > 0; }));
-    mApp->IndexWindowSlot().Close();
-
-    Open();
-
-    EXPECT_EQ(Row(kMusicRow)->State(), kJobNeverStarted);
-    EXPECT_EQ(Enabled(), "strip index ");
 }
 
 TEST_F(IndexerWindow, SettingsAreItsFrame) {
