@@ -31,7 +31,7 @@ CLVListItem::~CLVListItem() = default;
 void CLVListItem::SetOutlineLevel(uint32 level) {
     mOutlineLevel = level;
     BListItem::SetOutlineLevel(level);
-    OutlineRows::LevelChanged(mPlace);
+    OutlineRows::LevelChanged(this);
 }
 
 BRect CLVListItem::ItemColumnFrame(int32 column_index, ColumnListView* owner) {

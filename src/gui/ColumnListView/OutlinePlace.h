@@ -3,14 +3,19 @@
 
 #include <SupportDefs.h>
 
+#include <memory>
+
 struct OutlineBlock;
 
-// Written and read by OutlineRows; means nothing to anybody else.
+// Written and read by the lists; means nothing to anybody else.
 struct OutlinePlace {
-    OutlineBlock* block = nullptr;
-    // Which content of which list `block` belongs to; 0 for none.
-    uint64 content = 0;
+    OutlinePlace() = default;
+    // A copy of a row is in no list.
+    OutlinePlace(const OutlinePlace& /*other*/) {}
+    OutlinePlace& operator=(const OutlinePlace& /*other*/) { return *this; }
+
+    // Gone with the list, or with what was in it.
+    std::weak_ptr<OutlineBlock> block;
     // Where sorting has put the row, while it reorders.
     int32 rank = 0;
-    bool visible = false;
 };

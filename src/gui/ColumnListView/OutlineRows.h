@@ -18,6 +18,11 @@ class CLVListItem;
 // them. Not synchronised.
 class OutlineRows {
   public:
+    struct NewRow {
+        CLVListItem* row;
+        bool visible;
+    };
+
     OutlineRows();
     ~OutlineRows();
     OutlineRows(const OutlineRows&) = delete;
@@ -29,6 +34,7 @@ class OutlineRows {
     // -1 when it is not in here.
     int32 IndexOf(const CLVListItem* row) const;
     bool Has(const CLVListItem* row) const;
+    std::vector<CLVListItem*> Rows(int32 from, int32 to) const;
 
     bool IsVisible(const CLVListItem* row) const;
     // How many visible rows stand before this index, which may be CountRows().
@@ -36,33 +42,51 @@ class OutlineRows {
     // The index of a visible row, given its place among them.
     int32 IndexOfVisible(int32 visible) const;
 
-    // The nearest row before `index` of a smaller level than `level`; -1 when there is none.
+    // The nearest row before `index`, which may be CountRows(), of a smaller level than `level`; -1 when
+    // there is none.
     int32 FindSuper(int32 index, uint32 level) const;
     // The first index behind `index` whose row is not deeper than `level`; CountRows() when there is none.
     int32 FindEndBelow(int32 index, uint32 level) const;
-    // The smallest level among these rows.
+    // The smallest level among these rows, of which there is at least one.
     uint32 SmallestLevel(int32 index, int32 count) const;
 
+    // Before the row at `index`, which may be CountRows().
     void Insert(int32 index, CLVListItem* row, bool visible);
+    void Insert(int32 index, const std::vector<NewRow>& rows);
     void Remove(int32 index, int32 count);
     void Clear();
-    void SetVisible(int32 index, bool visible);
+    // The rows from `from` to before `to` become visible, but for those below one among them that is
+    // collapsed. Answers those that are visible now.
+    std::vector<CLVListItem*> Show(int32 from, int32 to);
+    // Answers how many of these rows were visible.
+    int32 Hide(int32 from, int32 to);
     // The same rows in another order; visible ones stay so. Each row's `rank` becomes its index.
     void Reorder(const std::vector<CLVListItem*>& rows);
-    std::vector<CLVListItem*> Rows(int32 from, int32 to) const;
 
-    // To be called by a row whose level has changed, wherever it is.
-    static void LevelChanged(OutlinePlace& place);
+    // To be called when a row's level has changed, wherever the row is.
+    static void LevelChanged(const CLVListItem* row);
 
   private:
+    // A row, and the one nearest before it of a smaller level, and so on.
+    struct Ancestor {
+        int32 index;
+        uint32 level;
+    };
+
     size_t BlockOf(int32 index) const;
-    void SplitWhenFull(size_t block);
-    void MergeWhenSmall(size_t block);
-    void NumberBlocksFrom(size_t block);
+    void Append(CLVListItem* row, bool visible);
+    std::vector<std::shared_ptr<OutlineBlock>> TakeBlocksFrom(int32 index);
+    void SplitBlock(size_t number, size_t offset);
+    void MergeWhenSmall(size_t number);
+    void NumberBlocksFrom(size_t number);
+    int32 ScanForSuper(int32 index, uint32 level) const;
+    void FindAncestorsOfEnd() const;
 
     // None of them empty.
-    std::vector<std::unique_ptr<OutlineBlock>> mBlocks;
+    std::vector<std::shared_ptr<OutlineBlock>> mBlocks;
     int32 mCount = 0;
     int32 mCountVisible = 0;
-    uint64 mContent;
+    // Of a row that would be appended with the largest level; the topmost first.
+    mutable std::vector<Ancestor> mAncestorsOfEnd;
+    mutable bool mAncestorsOfEndAreKnown = true;
 };
