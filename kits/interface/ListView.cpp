@@ -1,10 +1,12 @@
 #include <ListView.h>
 
 #include "ControlLook.h"
+#include "ListAutoscroll.h"
 #include "RowPositions.h"
 
 #include <Looper.h>
 #include <Message.h>
+#include <MessageRunner.h>
 #include <ScrollBar.h>
 #include <ScrollView.h>
 
@@ -88,7 +90,7 @@ void BListView::AttachedToWindow() {
 }
 
 void BListView::DetachedFromWindow() {
-    mPress = Press();
+    EndPress();
     BView::DetachedFromWindow();
 }
 
@@ -162,6 +164,10 @@ void BListView::DrawItem(BListItem* item, BRect frame, bool complete) {
 void BListView::MessageReceived(BMessage* message) {
     if (message->what == B_SELECT_ALL && mType == B_MULTIPLE_SELECTION_LIST) {
         Select(0, CountItems() - 1);
+        return;
+    }
+    if (message->what == kListAutoscroll) {
+        Autoscroll();
         return;
     }
     BView::MessageReceived(message);

@@ -8,6 +8,7 @@
 
 #include <memory>
 
+class BMessageRunner;
 class BScrollView;
 class RowPositions;
 
@@ -27,7 +28,9 @@ enum list_view_type { B_SINGLE_SELECTION_LIST, B_MULTIPLE_SELECTION_LIST };
 //
 // Mouse and keys: a click selects; in multiple-selection lists Control toggles and Shift extends from the row
 // last selected. Arrows, Page Up and Down, Home and End move the selection, with Shift they extend it, with
-// Control they move only the row that Control-Space toggles. Thread rule: that of BView.
+// Control they move only the row that Control-Space toggles. Where a drag is not taken up (InitiateDrag()),
+// the selection follows the pointer, and past the upper or lower edge the list scrolls, the faster the
+// farther. Thread rule: that of BView.
 class BListView : public BView, public BInvoker {
   public:
     BListView(BRect frame, const char* name, list_view_type type = B_SINGLE_SELECTION_LIST,
@@ -162,6 +165,12 @@ class BListView : public BView, public BInvoker {
         bool dragWasOffered = false;
         // The row becomes the only selected one when the button comes up without a drag.
         bool selectsOnRelease = false;
+        // The selection follows the pointer, which was last over (or nearest to) this row.
+        bool follows = false;
+        int32 followedRow = -1;
+        uint32 modifiers = 0;
+        // From the left top corner of what shows, which the pointer does not leave when the list scrolls.
+        BPoint pointer;
     };
 
     void InsertRows(int32 index, const BList& rows);
@@ -182,6 +191,13 @@ class BListView : public BView, public BInvoker {
     void SelectionHasChanged();
 
     void PressRow(int32 row, uint32 modifiers);
+    void EndPress();
+    void FollowPointer();
+    void SelectFollowed(int32 row);
+    // Scrolls on as long as the pointer is past an edge and there is anything left there.
+    void StartOrStopAutoscroll();
+    void Autoscroll();
+    float AutoscrollTarget() const;
     void SelectFromAnchorTo(int32 row, bool extend);
     void MoveCursor(int32 row, uint32 modifiers);
     void SetCursor(int32 row, bool shown);
@@ -203,6 +219,7 @@ class BListView : public BView, public BInvoker {
     int32 mCursor = -1;
     bool mCursorShown = false;
     Press mPress;
+    std::unique_ptr<BMessageRunner> mAutoscroller;
     // The row that CurrentSelection() found last, so that walking through the selection is linear.
     mutable int32 mCountedOrdinal = -1;
     mutable int32 mCountedRow = -1;

@@ -9,20 +9,13 @@
 #include <algorithm>
 #include <cmath>
 
-namespace {
-
-// How far the mouse moves with its button held before that is a drag.
-constexpr float kDragDistance = 4;
-
-} // namespace
-
 void BListView::MouseDown(BPoint where) {
     if (!IsFocus() && (Flags() & B_NAVIGABLE) != 0) {
         MakeFocus();
     }
     const InputState input = current_input(*this);
     const int32 row = IndexOf(where);
-    mPress = Press();
+    EndPress();
     if (row < 0) {
         if ((input.modifiers & (B_SHIFT_KEY | B_CONTROL_KEY)) == 0) {
             DeselectAll();
@@ -36,6 +29,8 @@ void BListView::MouseDown(BPoint where) {
     mPress.row = row;
     mPress.where = where;
     mPress.wasSelected = IsItemSelected(row);
+    mPress.followedRow = row;
+    mPress.modifiers = input.modifiers;
     // A host without a pointer never sends the events, and never a press either.
     (void)SetMouseEventMask(B_POINTER_EVENTS, B_LOCK_WINDOW_FOCUS);
     PressRow(row, input.modifiers);
@@ -60,32 +55,6 @@ void BListView::PressRow(int32 row, uint32 modifiers) {
     } else {
         Select(row);
     }
-}
-
-void BListView::MouseMoved(BPoint where, uint32 code, const BMessage* dragMessage) {
-    BView::MouseMoved(where, code, dragMessage);
-    const BPoint way = where - mPress.where;
-    const bool moved = std::abs(way.x) >= kDragDistance || std::abs(way.y) >= kDragDistance;
-    if (mPress.row < 0 || mPress.dragWasOffered || !moved) {
-        return;
-    }
-    mPress.dragWasOffered = true;
-    if (InitiateDrag(mPress.where, mPress.row, mPress.wasSelected)) {
-        mPress = Press();
-    }
-}
-
-void BListView::MouseUp(BPoint where) {
-    const Press press = mPress;
-    mPress = Press();
-    if (press.selectsOnRelease && IndexOf(where) == press.row) {
-        Select(press.row);
-    }
-    BView::MouseUp(where);
-}
-
-bool BListView::InitiateDrag(BPoint /*where*/, int32 /*index*/, bool /*wasSelected*/) {
-    return false;
 }
 
 void BListView::KeyDown(const char* bytes, int32 numBytes) {

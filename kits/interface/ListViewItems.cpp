@@ -156,6 +156,7 @@ void BListView::InsertRows(int32 index, const BList& rows) {
     mAnchor = AfterInsertion(mAnchor, index, count);
     mCursor = AfterInsertion(mCursor, index, count);
     mPress.row = AfterInsertion(mPress.row, index, count);
+    mPress.followedRow = AfterInsertion(mPress.followedRow, index, count);
     // A row may come with its selection, from an archive or another list.
     for (int32 i = index; i < index + count; ++i) {
         if (RowAt(i)->IsSelected()) {
@@ -185,7 +186,7 @@ bool BListView::RemoveRows(int32 index, int32 count) {
     // Keys go on from where the removed rows were.
     mAnchor = std::min(AfterRemoval(mAnchor, index, count), CountItems() - 1);
     mCursor = std::min(AfterRemoval(mCursor, index, count), CountItems() - 1);
-    mPress = Press();
+    EndPress();
     ForgetSelectionCount();
     mLastFound = index;
     FixupScrollBar();
@@ -203,7 +204,7 @@ void BListView::MakeEmpty() {
     mAnchor = -1;
     mCursor = -1;
     mCursorShown = false;
-    mPress = Press();
+    EndPress();
     ForgetSelectionCount();
     FixupScrollBar();
     Invalidate();
@@ -286,7 +287,7 @@ void BListView::SortItems(int (*compare)(const void* first, const void* second))
     RebuildPositions();
     mAnchor = anchor == nullptr ? -1 : IndexOf(anchor);
     mCursor = cursor == nullptr ? -1 : IndexOf(cursor);
-    mPress = Press();
+    EndPress();
     if (HasSelection()) {
         WidenSelectionBounds(0, CountItems() - 1);
         TightenSelectionBounds();
