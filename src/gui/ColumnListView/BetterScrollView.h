@@ -3,7 +3,6 @@
 
 #include <ScrollView.h>
 
-class BScrollBar;
 class ScrollViewCorner;
 
 // Its bars follow a data rectangle, in the target's coordinates, instead of the target's own size. Thread
@@ -17,7 +16,7 @@ class BetterScrollView : public BScrollView {
     // With `scrolling_allowed` the target is scrolled back where it would show what lies beyond the data;
     // without, the bars reach as far as what it shows.
     virtual void SetDataRect(BRect data_rect, bool scrolling_allowed = true);
-    // Invalid (-1, -1, -1, -1) until it is set.
+    // (-1, -1, -1, -1) until it is set; till then nothing is scrolled.
     BRect GetDataRect() const { return mDataRect; }
     void FrameResized(float new_width, float new_height) override;
 
@@ -26,9 +25,6 @@ class BetterScrollView : public BScrollView {
     void UpdateCorner(bool scrollable);
 
     BRect mDataRect = BRect(-1, -1, -1, -1);
-    // The children's owner is the view; null where there is none.
-    BScrollBar* mHScrollBar;
-    BScrollBar* mVScrollBar;
+    // Null when there is none; the view's child.
     ScrollViewCorner* mScrollViewCorner = nullptr;
-    BView* mTarget;
 };

@@ -55,7 +55,7 @@ class CLVColumn {
     // What lies to its right moves along. A width below the minimum becomes the minimum.
     virtual void SetWidth(float new_width);
     // Shortens the label for a column of this width; answers the part of the header that changes with it,
-    // invalid when none does or the header was never drawn.
+    // (-1, -1, -1, -1) when none does or the header was never drawn.
     BRect TruncateText(float column_width);
     unsigned long Flags() const { return mFlags; }
     bool IsShown() const { return (mFlags & CLV_COLUMN_HIDDEN) == 0; }
@@ -82,7 +82,8 @@ class CLVColumn {
     float ColumnEnd() const { return mColumnEnd; }
     bool IsPushedByExpander() const { return mPushedByExpander; }
     bool IsExpander() const { return (mFlags & CLV_COLUMN_EXPANDER) != 0; }
-    // Where the header was last drawn; invalid when never.
+    // Where the header was last drawn, and has been moved since; (-1, -1, -1, -1)
+    // when never.
     BRect HeaderFrame() const { return mHeaderFrame; }
 
     // For the list's layout alone.
@@ -93,8 +94,8 @@ class CLVColumn {
     void StoreSortMode(CLVSortMode mode) { mSortMode = mode; }
 
   private:
-    void MovePixels(BView* view, float oldEnd, float growth);
-    void ShowWidthChange(float oldEnd, float growth);
+    void ShowWidthChange(float growth);
+    void InvalidatePushedCells();
 
     std::string mLabel;
     std::string mTruncatedLabel;

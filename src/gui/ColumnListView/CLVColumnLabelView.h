@@ -3,10 +3,12 @@
 
 #include "gui/ColumnListView/DragGroups.h"
 
+#include <OS.h>
 #include <View.h>
 
 class CLVColumn;
 class ColumnListView;
+struct HeaderCell;
 
 // Shows a cell for each shown column. A click sorts by the column, a shift-click adds a sort key or reverses
 // it, a label that is dragged moves its group of columns, a cell's border that is dragged changes its width.
@@ -14,13 +16,14 @@ class ColumnListView;
 // messages of a mouse watcher. Made by the list. Thread rule: that of BView.
 class CLVColumnLabelView : public BView {
   public:
+    // The parent must live as long as the header.
     CLVColumnLabelView(BRect frame, ColumnListView* parent, const BFont* font);
 
     void Draw(BRect update_rect) override;
     void MouseDown(BPoint where) override;
     void MessageReceived(BMessage* message) override;
 
-    // The columns were laid out anew.
+    // The columns were laid out anew. A gesture goes on where its column now is, or ends with it.
     void UpdateDragGroups();
     // A gesture that is at work ends without effect; called when columns come or go.
     void CancelGesture();
@@ -28,29 +31,32 @@ class CLVColumnLabelView : public BView {
     void InvalidateColumn(const CLVColumn* column);
 
   private:
-    // What a gesture needs to know of the group that it drags.
+    // What a gesture needs to know of the group that it drags; ends it where there is none to drag.
     void SetSnapMinMax();
-    void ShiftDragGroup(int32 new_index);
+    // `left`: of the two groups that change places.
+    void ShiftDragGroup(int32 new_index, float left);
 
     CLVColumn* ColumnAt(float x) const;
     // The nearest shown column to the left; null when there is none.
     CLVColumn* ShownColumnBefore(const CLVColumn* column) const;
     void PressLabel(CLVColumn* column, BPoint where);
     void PressResizeHandle(CLVColumn* column, BPoint where);
-    void DragLabelTo(BPoint where);
+    bool WatchMouse();
+    void DragLabelTo(float x);
     void ResizeTo(float x);
-    void Release(uint32 modifiers);
-    void ClickColumn(uint32 modifiers);
+    void Release(uint32 modifierKeys);
+    void ClickColumn(CLVColumn* column, uint32 modifierKeys);
     void EndGesture();
+    void ForgetGesture();
 
     void ShiftWhilePointerIsBeyond(float x);
-    void InvalidateShift(float left);
     void InvalidateOutline(float left, float right);
+    void InvalidateLastOutline();
+    void InvalidateRightBorder(const CLVColumn* column);
     // Where the outline of the dragged group is drawn for the pointer at x.
     float OutlineLeftFor(float x) const;
 
-    void DrawCells(BRect update_rect);
-    void DrawEmptyHeader();
+    void DrawCell(const HeaderCell& cell);
     void DrawDragOutline();
 
     float mFontAscent;
@@ -69,5 +75,7 @@ class CLVColumnLabelView : public BView {
     // Where the outline was last drawn; -1 when it was not.
     float mPrevDragOutlineLeft = -1;
     float mPrevDragOutlineRight = -1;
+    // Follows the mouse; -1 when none does, though one that has yet to end is not counted.
+    thread_id mWatcher = -1;
     ColumnListView* mParent;
 };
