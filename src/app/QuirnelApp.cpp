@@ -3,6 +3,7 @@
 #include "app/AppMessages.h"
 #include "indexing/FileIndexWindow.h"
 #include "indexing/UnattendedJobs.h"
+#include "soundplay/SoundplayScripter.h"
 
 #include <Alert.h>
 #include <IndexMaintenance.h>
@@ -26,6 +27,7 @@ QuirnelApp::QuirnelApp()
 }
 
 QuirnelApp::~QuirnelApp() {
+    mScripter.reset();
     mJobsWithoutWindow.reset();
     // What the jobs have changed is in the index before the program ends.
     close_indices();
@@ -124,6 +126,12 @@ BMenu* QuirnelApp::MakeFileMenu(long, long closeCode) {
     menu->AddSeparatorItem();
     menu->AddItem(new BMenuItem("Close", new BMessage(static_cast<uint32>(closeCode)), 'W'));
     return menu;
+}
+
+SoundplayScripter* QuirnelApp::GetSoundplayScripter() {
+    if (!mScripter)
+        mScripter = std::make_unique<SoundplayScripter>();
+    return mScripter.get();
 }
 
 void QuirnelApp::AboutRequested() {

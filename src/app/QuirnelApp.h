@@ -13,6 +13,7 @@ class BMenu;
 class BMessage;
 class BVolume;
 class BVolumeRoster;
+class SoundplayScripter;
 class UnattendedJobs;
 
 inline constexpr char kQuirnelSignature[] = "application/x-vnd.vorn-quirnel";
@@ -25,7 +26,8 @@ class QuirnelApp : public BApplication {
   public:
     // Installs the application's MIME type when it is missing.
     QuirnelApp();
-    // Cancels jobs that still run without their window. Closes no window: QuitRequested() does.
+    // Ends the connection to the SoundPlay player, and cancels jobs that still run without their window.
+    // Closes no window: QuitRequested() does.
     ~QuirnelApp() override;
 
     // Prepares file manager and volumes and opens the windows that were open last time; both main windows
@@ -55,6 +57,10 @@ class QuirnelApp : public BApplication {
     void SavePreferences(BFile* file);
     // Nothing for null.
     void SavePreferences(BMessage* settings);
+
+    // The remote control of the SoundPlay player, made at the first call: always the same one, which belongs
+    // to the application.
+    SoundplayScripter* GetSoundplayScripter();
 
     // Windows fill their slots as they open, and empty them when they close by themselves.
     WindowSlot& IndexWindowSlot() { return mIndexWindow; }
@@ -86,6 +92,8 @@ class QuirnelApp : public BApplication {
     void OpenFindWindow(BMessage* settings);
     void OpenPlayListWindow(BMessage* settings);
 
+    // Null until it is first needed.
+    std::unique_ptr<SoundplayScripter> mScripter;
     // Null until it is first needed, then kept with its place in the list of volumes.
     std::unique_ptr<BVolumeRoster> mVolumeRoster;
     WindowSlot mPlayListWindow;

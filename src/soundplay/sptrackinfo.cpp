@@ -1,0 +1,7 @@
+#include "soundplay/sptrackinfo.h"
+
+#include <cstdio>
+
+void sptrackinfo::ParseReply(BMessage*) {
+    printf("GetValues:\n");
+}

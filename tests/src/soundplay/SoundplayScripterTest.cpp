@@ -1,0 +1,355 @@
+// The remote control against a player of the test's own, which writes down what it is sent.
+#include "soundplay/SoundplayScripter.h"
+
+#include "soundplay/ScriptMessage.h"
+#include "support/captured_output.h"
+#include "support/program.h"
+#include "support/temporary_environment.h"
+
+#include <Application.h>
+#include <Entry.h>
+#include <OS.h>
+#include <Roster.h>
+
+#include <csignal>
+#include <filesystem>
+#include <functional>
+#include <gtest/gtest.h>
+#include <memory>
+
+namespace {
+
+constexpr const char* kNewRef = "layer 61627261 command=int32 4 newref=ref song.mp3\n";
+constexpr const char* kMinimize = "player 5f574d4e minimize=bool true when=int64 now\n";
+
+bool Eventually(const std::function<bool()>& condition) {
+    for (int round = 0; round < 2000; round++) {
+        if (condition())
+            return true;
+        snooze(10'000);
+    }
+    return false;
+}
+
+class SoundplayScripterTest : public testing::Test {
+  protected:
+    SoundplayScripterTest() : mApplication("application/x-vnd.Test-Scripter") {
+        mEnvironment.set("TEST_PLAYER_LOG", Path("log"));
+        mEnvironment.set("TEST_PLAYER_MODE", "answers");
+        test::write_file(Path("song.mp3"), "x");
+        BEntry(Path("song.mp3").c_str()).GetRef(&mSong);
+    }
+    ~SoundplayScripterTest() override {
+        if (be_roster->IsRunning(kSoundPlaySignature)) {
+            BMessenger(kSoundPlaySignature).SendMessage(B_QUIT_REQUESTED);
+            EXPECT_TRUE(PlayerEnds());
+        }
+    }
+
+    std::string Path(const std::string& leaf) const { return mEnvironment.root() + "/" + leaf; }
+    std::string Log() const { return test::read_file(Path("log")); }
+    bool LogBecomes(const std::string& text) const {
+        return Eventually([&] { return Log() == text; });
+    }
+    // The player can be launched from now on.
+    void Install() {
+        const std::string directory = mEnvironment.home() + "/.local/share/bekits/applications";
+        std::filesystem::create_directories(directory);
+        test::write_file(
+            directory + "/application,x-marcone-soundplay.app",
+            std::string("[Application]\nSignature=application/x-marcone-soundplay\nExecutable=") +
+                TEST_PLAYER + "\nLaunch=exclusive\nBackground=true\n");
+    }
+    std::unique_ptr<test::Program> StartPlayer() {
+        auto player = std::make_unique<test::Program>(TEST_PLAYER, std::vector<std::string>{});
+        EXPECT_TRUE(Eventually([] { return be_roster->IsRunning("application/x-marcone-soundplay"); }));
+        EXPECT_TRUE(Eventually([&] { return Log() == "ready\n"; }));
+        return player;
+    }
+    static bool PlayerEnds() {
+        return Eventually([] { return !be_roster->IsRunning("application/x-marcone-soundplay"); });
+    }
+    static std::string Printed(const std::function<void()>& action) {
+        CapturedOutput output;
+        action();
+        return output.text();
+    }
+    static std::string NewLayerLine(const sptrackinfo& layer) {
+        return "player 61627261 waiting command=int32 1 name=string song.mp3 port=int32 " +
+               std::to_string(layer.port) + "\n";
+    }
+
+    test::TemporaryEnvironment mEnvironment;
+    BApplication mApplication;
+    entry_ref mSong;
+};
+
+} // namespace
+
+TEST_F(SoundplayScripterTest, AScriptMessageIsItsCommandFromTheBeginning) {
+    const ScriptMessage message(SCRIPTSETVALUES);
+    EXPECT_EQ(message.what, 1633841761u);
+    EXPECT_EQ(message.GetInt32("command", -1), 4);
+    EXPECT_EQ(message.CountNames(B_ANY_TYPE), 1);
+    EXPECT_EQ(SCRIPTNEWLAYER, 1);
+    EXPECT_EQ(SCRIPTDELETELAYER, 3);
+    EXPECT_EQ(SCRIPTGETVALUES, 5);
+}
+
+TEST_F(SoundplayScripterTest, MakingAndDeletingItStartsNoPlayer) {
+    Install();
+    EXPECT_EQ(Printed([] { SoundplayScripter scripter; }), "");
+    EXPECT_FALSE(be_roster->IsRunning(kSoundPlaySignature));
+    EXPECT_EQ(Log(), "");
+}
+
+TEST_F(SoundplayScripterTest, TheFirstLayerStartsThePlayerWhichEndsWithTheScripter) {
+    Install();
+    auto scripter = std::make_unique<SoundplayScripter>();
+    sptrackinfo* layer = nullptr;
+    auto* const track = reinterpret_cast<SoundplayBrindleTrack*>(&mSong);
+    const bigtime_t begun = system_time();
+    EXPECT_EQ(Printed([&] { layer = scripter->NewLayer(&mSong, track); }),
+              "Soundplay connection succeeded\nGetValues:\n");
+    EXPECT_GE(system_time() - begun, 1'000'000);
+    ASSERT_NE(layer, nullptr);
+    EXPECT_EQ(layer->track, track);
+    EXPECT_TRUE(layer->messenger->IsValid());
+    EXPECT_FALSE(layer->messenger->IsTargetLocal());
+    port_info info;
+    ASSERT_EQ(get_port_info(layer->port, &info), B_OK);
+    EXPECT_STREQ(info.name, "spport");
+    EXPECT_EQ(info.capacity, 4);
+    EXPECT_EQ(info.queue_count, 0);
+    const std::string log = std::string("ready\n") + kMinimize + NewLayerLine(*layer) + kNewRef;
+    EXPECT_TRUE(LogBecomes(log)) << Log();
+
+    const bigtime_t ending = system_time();
+    EXPECT_EQ(Printed([&] { scripter.reset(); }), "");
+    EXPECT_GE(system_time() - ending, 1'000'000);
+    EXPECT_TRUE(PlayerEnds());
+    EXPECT_TRUE(LogBecomes(log + "quit\nended\n")) << Log();
+    // The record of a layer that was not deleted outlives the scripter.
+    EXPECT_EQ(layer->track, track);
+    EXPECT_FALSE(layer->messenger->IsValid());
+}
+
+TEST_F(SoundplayScripterTest, APlayerThatRunsIsFoundAndNeverEnded) {
+    const auto player = StartPlayer();
+    sptrackinfo* layer = nullptr;
+    std::unique_ptr<SoundplayScripter> scripter;
+    EXPECT_EQ(Printed([&] { scripter = std::make_unique<SoundplayScripter>(); }),
+              "SoundPlay already running, establishing connection...");
+    EXPECT_EQ(Printed([&] { scripter->StartSoundPlay(); }), "");
+    EXPECT_EQ(Printed([&] { layer = scripter->NewLayer(&mSong, nullptr); }), "GetValues:\n");
+    ASSERT_NE(layer, nullptr);
+    EXPECT_EQ(layer->track, nullptr);
+    EXPECT_EQ(Printed([&] { scripter.reset(); }), "");
+    // Neither minimised nor ended.
+    EXPECT_TRUE(LogBecomes("ready\n" + NewLayerLine(*layer) + kNewRef)) << Log();
+    EXPECT_TRUE(player->running());
+}
+
+TEST_F(SoundplayScripterTest, APlayerThatWasStartedMeanwhileIsConnectedToAndNotEnded) {
+    Install();
+    auto scripter = std::make_unique<SoundplayScripter>();
+    const auto player = StartPlayer();
+    sptrackinfo* layer = nullptr;
+    EXPECT_EQ(Printed([&] { layer = scripter->NewLayer(&mSong, nullptr); }),
+              "Soundplay already ran...\nSoundplay connection succeeded\nGetValues:\n");
+    ASSERT_NE(layer, nullptr);
+    EXPECT_TRUE(LogBecomes(std::string("ready\n") + kMinimize + NewLayerLine(*layer) + kNewRef)) << Log();
+    EXPECT_EQ(Printed([&] { scripter.reset(); }), "");
+    EXPECT_TRUE(player->running());
+    EXPECT_TRUE(be_roster->IsRunning(kSoundPlaySignature));
+}
+
+TEST_F(SoundplayScripterTest, APlayerThatCannotBeStartedIsSaidAndThereIsNoLayer) {
+    const std::string directory = mEnvironment.home() + "/.local/share/bekits/applications";
+    std::filesystem::create_directories(directory);
+    SoundplayScripter scripter;
+    test::write_file(directory + "/application,x-marcone-soundplay.app",
+                     "[Application]\nSignature=application/x-marcone-soundplay\nExecutable=/bin/"
+                     "false\nLaunch=exclusive\n");
+    sptrackinfo* layer = nullptr;
+    // It ends before it runs.
+    EXPECT_EQ(Printed([&] { layer = scripter.NewLayer(&mSong, nullptr); }),
+              "Error -2147475451 while launching SoundPlay\n");
+    EXPECT_EQ(layer, nullptr);
+    EXPECT_EQ(Printed([&] { scripter.QuitSoundPlay(); }), "");
+}
+
+TEST_F(SoundplayScripterTest, EachCommandReachesTheLayerWithItsOneField) {
+    const auto player = StartPlayer();
+    SoundplayScripter scripter;
+    sptrackinfo* const layer = scripter.NewLayer(&mSong, nullptr);
+    ASSERT_NE(layer, nullptr);
+    std::string log = "ready\n" + NewLayerLine(*layer) + kNewRef;
+    ASSERT_TRUE(LogBecomes(log));
+    struct Case {
+        std::function<void()> command;
+        const char* printed;
+        const char* logged;
+    };
+    const Case cases[] = {
+        {[&] { scripter.RepitchLayer(layer, 1.25); }, "",
+         "layer 61627261 command=int32 4 pitch=double 1.25\n"},
+        {[&] { scripter.RepitchLayer(layer, -0.5); }, "",
+         "layer 61627261 command=int32 4 pitch=double -0.5\n"},
+        {[&] { scripter.SeekLayer(layer, 61.5); }, "", "layer 61627261 command=int32 4 abspos=double 61.5\n"},
+        {[&] { scripter.SetLevel(layer, 0.1f); }, "SoundplayScripter::SetLevel(): 0.100000\n",
+         "layer 61627261 command=int32 4 volume=double 0.10000000149011612\n"},
+        {[&] { scripter.UpdateLayerInfo(layer); }, "Reply to SCRIPTGETVALUES: \n",
+         "layer 61627261 command=int32 5\n"},
+        {[&] { scripter.SetLayerTrack(layer, &mSong); }, "", kNewRef},
+        {[&] { scripter.DeleteLayer(layer); }, "", "layer 61627261 command=int32 3\n"},
+    };
+    const port_id port = layer->port;
+    const BMessenger* const messenger = layer->messenger;
+    for (const Case& entry : cases) {
+        EXPECT_EQ(Printed(entry.command), entry.printed);
+        log += entry.logged;
+        EXPECT_TRUE(LogBecomes(log)) << Log();
+    }
+    // Neither is freed with its layer.
+    port_info info;
+    EXPECT_EQ(get_port_info(port, &info), B_OK);
+    EXPECT_TRUE(messenger->IsValid());
+}
+
+TEST_F(SoundplayScripterTest, ALayerThatIsNotOpenIsRefusedWithItsText) {
+    const auto player = StartPlayer();
+    SoundplayScripter scripter;
+    BMessenger messenger(kSoundPlaySignature);
+    sptrackinfo stranger;
+    stranger.messenger = &messenger;
+    struct Case {
+        std::function<void()> command;
+        const char* printed;
+    };
+    const Case cases[] = {
+        {[&] { scripter.DeleteLayer(&stranger); }, "SoundplayScripter::DeleteLayer: layer not found\n"},
+        {[&] { scripter.UpdateLayerInfo(&stranger); },
+         "SoundplayScripter::UpdateLayerInfo: layer not found\n"},
+        {[&] { scripter.RepitchLayer(&stranger, 2); }, "SoundplayScripter::RepitchLayer: layer not found\n"},
+        {[&] { scripter.SeekLayer(&stranger, 2); }, "SoundplayScripter::SeekLayer: layer not found\n"},
+        {[&] { scripter.SetLevel(&stranger, 0.5f); },
+         "SoundplayScripter::SetLevel(): 0.500000\nSoundplayScripter::SeekLayer: layer not found\n"},
+        {[&] { scripter.DeleteLayer(nullptr); }, "SoundplayScripter::DeleteLayer: layer not found\n"},
+    };
+    for (const Case& entry : cases)
+        EXPECT_EQ(Printed(entry.command), entry.printed);
+    sptrackinfo* const layer = scripter.NewLayer(&mSong, nullptr);
+    ASSERT_TRUE(LogBecomes("ready\n" + NewLayerLine(*layer) + kNewRef)) << Log();
+    const sptrackinfo copy = *layer;
+    scripter.DeleteLayer(layer);
+    // A record with the layer's own messenger is still not the layer's record.
+    sptrackinfo same = copy;
+    EXPECT_EQ(Printed([&] { scripter.DeleteLayer(&same); }),
+              "SoundplayScripter::DeleteLayer: layer not found\n");
+}
+
+TEST_F(SoundplayScripterTest, APlayerThatDoesNotAnswerLeavesALayerThatNothingReaches) {
+    mEnvironment.set("TEST_PLAYER_MODE", "silent");
+    const auto player = StartPlayer();
+    SoundplayScripter scripter;
+    sptrackinfo* layer = nullptr;
+    const bigtime_t begun = system_time();
+    EXPECT_EQ(Printed([&] { layer = scripter.NewLayer(&mSong, nullptr); }), "GetValues:\n");
+    EXPECT_GE(system_time() - begun, 3'000'000);
+    ASSERT_NE(layer, nullptr);
+    EXPECT_FALSE(layer->messenger->IsValid());
+    EXPECT_EQ(Printed([&] {
+                  scripter.RepitchLayer(layer, 2);
+                  scripter.SeekLayer(layer, 2);
+                  scripter.UpdateLayerInfo(layer);
+                  scripter.DeleteLayer(layer);
+              }),
+              "Reply to SCRIPTGETVALUES: \n");
+    EXPECT_EQ(Printed([&] { scripter.DeleteLayer(layer); }),
+              "SoundplayScripter::DeleteLayer: layer not found\n");
+}
+
+TEST_F(SoundplayScripterTest, AnAnswerWithoutMessengerLeavesALayerThatNothingReaches) {
+    mEnvironment.set("TEST_PLAYER_MODE", "nameless");
+    const auto player = StartPlayer();
+    SoundplayScripter scripter;
+    sptrackinfo* layer = nullptr;
+    EXPECT_EQ(Printed([&] { layer = scripter.NewLayer(&mSong, nullptr); }), "GetValues:\n");
+    ASSERT_NE(layer, nullptr);
+    EXPECT_FALSE(layer->messenger->IsValid());
+    const std::string log = "ready\n" + NewLayerLine(*layer);
+    EXPECT_EQ(Printed([&] { scripter.SeekLayer(layer, 2); }), "");
+    EXPECT_EQ(Printed([&] { scripter.SetLayerTrack(layer, &mSong); }), "error sending opentrack\n");
+    EXPECT_EQ(Printed([&] { scripter.DeleteLayer(layer); }), "");
+    // Nothing was sent to a layer.
+    EXPECT_EQ(Log(), log);
+}
+
+TEST_F(SoundplayScripterTest, APlayerThatDiesIsNotNoticedButByTheTrack) {
+    const auto player = StartPlayer();
+    SoundplayScripter scripter;
+    sptrackinfo* const layer = scripter.NewLayer(&mSong, nullptr);
+    ASSERT_NE(layer, nullptr);
+    player->signal(SIGKILL);
+    player->wait();
+    EXPECT_EQ(Printed([&] {
+                  scripter.RepitchLayer(layer, 2);
+                  scripter.SeekLayer(layer, 2);
+              }),
+              "");
+    EXPECT_EQ(Printed([&] { scripter.SetLayerTrack(layer, &mSong); }), "error sending opentrack\n");
+    EXPECT_EQ(Printed([&] { scripter.DeleteLayer(layer); }), "");
+    // Connected it stays: there is no other start, and the layer is one that nothing reaches.
+    sptrackinfo* orphan = nullptr;
+    EXPECT_EQ(Printed([&] { orphan = scripter.NewLayer(&mSong, nullptr); }), "GetValues:\n");
+    ASSERT_NE(orphan, nullptr);
+    EXPECT_FALSE(orphan->messenger->IsValid());
+    EXPECT_EQ(Printed([&] { scripter.DeleteLayer(orphan); }), "");
+}
+
+TEST_F(SoundplayScripterTest, APlayerThatWasEndedIsNotStartedAgain) {
+    Install();
+    auto scripter = std::make_unique<SoundplayScripter>();
+    EXPECT_EQ(Printed([&] { scripter->StartSoundPlay(); }), "Soundplay connection succeeded\n");
+    EXPECT_EQ(Printed([&] { scripter->QuitSoundPlay(); }), "");
+    EXPECT_TRUE(PlayerEnds());
+    sptrackinfo* layer = nullptr;
+    EXPECT_EQ(Printed([&] { layer = scripter->NewLayer(&mSong, nullptr); }), "");
+    EXPECT_EQ(layer, nullptr);
+    EXPECT_FALSE(be_roster->IsRunning(kSoundPlaySignature));
+    EXPECT_EQ(Printed([&] { scripter->QuitSoundPlay(); }),
+              "SoundplayScripter::QuitSoundPlay(): No messenger\n");
+    EXPECT_EQ(Printed([&] { scripter.reset(); }), "SoundplayScripter::QuitSoundPlay(): No messenger\n");
+}
+
+TEST_F(SoundplayScripterTest, OfTwoClientsOnlyTheOneThatStartedThePlayerEndsIt) {
+    Install();
+    auto first = std::make_unique<SoundplayScripter>();
+    Printed([&] { first->StartSoundPlay(); });
+    std::unique_ptr<SoundplayScripter> second;
+    EXPECT_EQ(Printed([&] { second = std::make_unique<SoundplayScripter>(); }),
+              "SoundPlay already running, establishing connection...");
+    sptrackinfo* layer = nullptr;
+    Printed([&] { layer = second->NewLayer(&mSong, nullptr); });
+    // A layer belongs to the scripter that opened it.
+    EXPECT_EQ(Printed([&] { first->SeekLayer(layer, 1); }),
+              "SoundplayScripter::SeekLayer: layer not found\n");
+    second.reset();
+    EXPECT_TRUE(be_roster->IsRunning(kSoundPlaySignature));
+    first.reset();
+    EXPECT_TRUE(PlayerEnds());
+}
+
+TEST_F(SoundplayScripterTest, ALayerOfAnotherClientCanBeTakenUp) {
+    const auto player = StartPlayer();
+    SoundplayScripter first;
+    sptrackinfo* const layer = first.NewLayer(&mSong, nullptr);
+    ASSERT_TRUE(LogBecomes("ready\n" + NewLayerLine(*layer) + kNewRef));
+    SoundplayScripter second;
+    sptrackinfo* const same = second.TakeUpLayer(*layer->messenger);
+    EXPECT_EQ(Printed([&] { second.SeekLayer(same, 7); }), "");
+    EXPECT_TRUE(LogBecomes("ready\n" + NewLayerLine(*layer) + kNewRef +
+                           "layer 61627261 command=int32 4 abspos=double 7\n"))
+        << Log();
+}
