@@ -4,6 +4,7 @@
 #include "gui/ColumnListView/CLVColumn.h"
 #include "gui/ColumnListView/CLVListItem.h"
 #include "gui/ColumnListView/OutlineRows.h"
+#include "gui/ColumnListView/RowOrder.h"
 
 #include <List.h>
 #include <ListView.h>
@@ -16,13 +17,18 @@ class CLVColumnLabelView;
 class CLVContainerView;
 class PrefilledBitmap;
 
-// Negative, zero or positive, as strcmp().
-typedef int (*CLVCompareFuncPtr)(const CLVListItem* a, const CLVListItem* b, long column_index);
-
 // Columns have an index, in the order in which they were added, and a place in the display order. In a
 // hierarchical list, rows have an index in the full list, every row in outline order, and, where no collapsed
 // row hides them, one in the BListView, whose operations (selection, ItemAt(), IndexOf(), CurrentSelection())
-// see the visible rows alone. A flat list knows visible rows only.
+// see the visible rows alone. In a flat list all rows are visible and both indices are the same.
+//
+// A row is visible when its super-row, the nearest before it of a smaller level, is visible and expanded;
+// this is looked at when the row is added and when rows above it are expanded or collapsed. Rows that come to
+// be hidden are no longer selected.
+//
+// Rows keep their places in whole numbers, but frames and points are floats, which above 16 777 216 pixels
+// (some 800 000 rows of 20) know even numbers only. So down there, up to twice that height, a row's frame may
+// lie one pixel off and a click on the border of two rows may mean the other one; nothing adds up.
 //
 // The columns are the list's, the rows the application's, removed or not. A row is in one list, once. Methods
 // that refuse answer false or null and change nothing.
@@ -41,14 +47,19 @@ class ColumnListView : public BListView {
                    border_style border = B_NO_BORDER, const BFont* label_font = be_plain_font);
     ~ColumnListView() override;
 
+    void AttachedToWindow() override;
+    void SetFont(const BFont* font, uint32 mask = B_FONT_ALL) override;
+    // On the arrow of a super-row it expands or collapses, and does nothing else.
     void MouseDown(BPoint where) override;
+    // In an outline with one row selected, the right arrow key expands a super-row and goes on to the first
+    // row below it, the left one collapses it and goes on to its super-row. Otherwise they scroll sideways.
     void KeyDown(const char* bytes, int32 numBytes) override;
     void FrameResized(float new_width, float new_height) override;
     using BListView::ScrollTo;
     void ScrollTo(BPoint where) override;
 
     // At the end; or, hierarchical, before the row at `full_index` of the full list. False for what is no
-    // CLVListItem or is in this list already.
+    // CLVListItem or is in a list already.
     bool AddItem(BListItem* item) override;
     bool AddItem(BListItem* item, int32 full_index) override;
     // One after the other, until one is refused; those before it stay. All must be CLVListItems.
@@ -99,7 +110,8 @@ class ColumnListView : public BListView {
     int32 CountColumns() const;
     int32 IndexOfColumn(CLVColumn* column) const;
     CLVColumn* ColumnAt(int32 column_index) const;
-    // An array of CountColumns() column indices, the caller's to delete[].
+    // An array of CountColumns() column indices, the caller's to delete[]. -1 stands for places that a
+    // refused SetDisplayOrder() has left without a column.
     int32* DisplayOrder() const;
 
     // Null for none: then nothing is ever reordered.
@@ -107,10 +119,10 @@ class ColumnListView : public BListView {
     // Ascending, descending, none, and again; through SetSortMode().
     void ReverseSortMode(int32 column_index);
     // Rows that compare equal come out in the order that an exchange sort gives them (hierarchical), or keep
-    // theirs (flat). A super-row takes its subtree along.
+    // theirs (flat). A row takes all rows below it along.
     void SortItems();
     // How many keys there are; fills in column index and mode of each, the first key first. Null for what is
-    // not wanted.
+    // not wanted. A key that RemoveColumns() has left there is no column any more: -1 and CLV_SORT_NONE.
     int32 Sorting(int32* keys, CLVSortMode* modes) const;
     void SetSorting(int32 count, int32* keys, CLVSortMode* modes);
 
@@ -170,25 +182,35 @@ class ColumnListView : public BListView {
     void EmbedInContainer(bool horizontal, bool vertical, bool scroll_view_corner, border_style border,
                           uint32 resizing_mode, uint32 flags);
     void ColumnsChanged();
+    bool AddColumns(const BList& columns);
+    void ForgetColumns(int32 index, int32 count);
     void UpdateDataRect(bool scroll_bars);
+    void InvalidateShifted(const CLVColumn& column, float limit);
     void InvalidateHeaderOf(const CLVColumn* column);
-    void InvalidateSortKeyHeaders();
 
+    static bool CanAdd(const BListItem* item);
+    static size_t CountAddable(const std::vector<CLVListItem*>& rows);
+    bool IsToBeSeen(int32 full_index, uint32 level) const;
+    std::vector<OutlineRows::NewRow> WithVisibility(const std::vector<CLVListItem*>& rows,
+                                                    int32 full_index) const;
     bool AddItemPrivate(CLVListItem* item, int32 full_index);
-    bool CanAdd(BListItem* item) const;
-    void ShowRows(int32 full_from, int32 full_to, int32 visible_index);
-    void HideRows(int32 full_from, int32 full_to);
-    void RedrawExpander(CLVListItem* item);
+    bool RemoveRun(int32 full_index, int32 count);
+    std::vector<CLVListItem*> AllRows() const;
 
-    int CompareRows(const CLVListItem* a, const CLVListItem* b) const;
-    void SortFullListSegment(int32 full_index, std::vector<CLVListItem*>& out) const;
-    std::vector<CLVListItem*> SortItemsInThisLevel(int32 full_index) const;
-    void SortListArray(std::vector<CLVListItem*>& items) const;
+    void SetExpanded(CLVListItem* item, bool expanded);
+    void ShowOrHideRowsBelow(const CLVListItem* item);
+    CLVListItem* OnlySelectedItem() const;
+    bool GoDownTheOutline();
+    bool GoUpTheOutline();
 
-    BList mColumns;      // CLVColumn
-    BList mDisplayOrder; // CLVColumn
-    BList mSortKeys;     // CLVColumn, the primary key first
-    OutlineRows mFullList;
+    void UseAsSortKey(CLVColumn* column);
+    void InvalidateSortKeyHeaders();
+    RowOrder OrderBySortKeys() const;
+
+    BList mColumns;        // CLVColumn
+    BList mDisplayOrder;   // CLVColumn
+    BList mSortKeys;       // CLVColumn, the primary key first
+    OutlineRows mFullList; // of a flat list, what is in the BListView
     std::unique_ptr<PrefilledBitmap> mRightArrow;
     std::unique_ptr<PrefilledBitmap> mDownArrow;
     bool mHierarchical;
