@@ -26,8 +26,7 @@ class FileIndexWindow : public BWindow {
 
     // Redraws the rows whose jobs are at work or have just ended.
     void Pulse();
-    // Enables what can be done with that row. Nothing for null. The list gets the keyboard where the button
-    // that had it is disabled.
+    // Enables what can be done with that row. Nothing for null.
     void UpdateButtons(FileIndexListItem* item);
 
     void MessageReceived(BMessage* message) override;

@@ -147,9 +147,9 @@ void CLVColumn::SetWidth(float new_width) {
 void CLVColumn::ShowWidthChange(float growth) {
     CLVColumnLabelView* const header = mParent->HeaderView();
     if ((mFlags & CLV_COLUMN_HEADER_TRUNCATE) != 0) {
-        const BRect changed = TruncateText(mWidth);
-        if (changed != kNowhere) {
-            InvalidateIfValid(header, changed);
+        // The whole label, as an ellipsis may draw the letter before it nearer, or change its shape.
+        if (TruncateText(mWidth) != kNowhere) {
+            InvalidateIfValid(header, mHeaderFrame);
         }
     }
     const float oldEnd = mColumnEnd;
