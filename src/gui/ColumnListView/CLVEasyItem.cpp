@@ -22,8 +22,9 @@ constexpr rgb_color kGround = {255, 255, 255, 255};
 // From the cell's left edge to its text, and what a shortened text leaves free on both sides together.
 constexpr float kTextIndent = 2;
 constexpr float kTextMargin = 4;
-// How far a letter's shape may reach to the left of its place, or be drawn closer to the one before it.
+// How far a letter's shape may reach to the left of its place, and how many before it it may be joined with.
 constexpr float kLetterOverlap = 2;
+constexpr size_t kJoinedLetters = 2;
 
 // How many bytes, whole characters of UTF-8, both texts begin with.
 size_t CommonPrefix(const std::string& a, const std::string& b) {
@@ -36,6 +37,13 @@ size_t CommonPrefix(const std::string& a, const std::string& b) {
         --length;
     }
     return length;
+}
+
+// How many bytes of a text look the same whatever follows them.
+size_t SettledPrefix(const std::string& text, size_t prefix) {
+    const bool ascii = std::all_of(text.begin(), text.end(), [](char byte) { return (byte & 0x80) == 0; });
+    // Other scripts join and order their letters as a whole.
+    return ascii ? prefix - std::min(prefix, kJoinedLetters) : 0;
 }
 
 // A text is shortened by bytes; half a character before the ellipsis is not to be seen.
@@ -227,7 +235,8 @@ BRect CLVEasyItem::TruncateText(Cell& cell, BRect frame, float column_width) {
     if (frame == kNoRect) {
         return kNoRect;
     }
-    const float prefix = be_plain_font->StringWidth(drawn.shortened.c_str(), static_cast<int32>(same));
+    const float prefix = be_plain_font->StringWidth(drawn.shortened.c_str(),
+                                                    static_cast<int32>(SettledPrefix(drawn.shortened, same)));
     frame.left += std::max(0.0F, std::floor(kTextIndent + prefix) - kLetterOverlap);
     return frame;
 }
