@@ -110,7 +110,9 @@ void ColumnListView::FrameResized(float new_width, float new_height) {
 void ColumnListView::ScrollTo(BPoint where) {
     AssertWindowLocked();
     BListView::ScrollTo(where);
-    mHeaderView->ScrollTo(BPoint(where.x, 0));
+    if (Parent() != nullptr) {
+        mHeaderView->ScrollTo(BPoint(where.x, 0));
+    }
 }
 
 void ColumnListView::UpdateColumnSizesDataRectSizeScrollBars(bool scroll_bars) {
@@ -120,6 +122,10 @@ void ColumnListView::UpdateColumnSizesDataRectSizeScrollBars(bool scroll_bars) {
 }
 
 void ColumnListView::UpdateDataRect(bool scroll_bars) {
+    // In the list's destructor, where an application takes its rows out, container and header are gone.
+    if (Parent() == nullptr) {
+        return;
+    }
     const float height = IsEmpty() ? 0 : ItemFrame(CountItems() - 1).bottom;
     mContainer->SetDataRect(BRect(0, 0, mDataWidth, height), scroll_bars);
 }

@@ -1,5 +1,7 @@
 #include "ListOnStage.h"
 
+#include <memory>
+
 namespace {
 
 constexpr BRect kNoRect(-1, -1, -1, -1);
@@ -275,4 +277,23 @@ TEST_F(CLVListItemTest, RemembersLevelAndSuperRow) {
     EXPECT_EQ(1U, row.OutlineLevel());
     EXPECT_EQ(1U, static_cast<BListItem&>(row).OutlineLevel());
     EXPECT_FALSE(row.IsSuperItem());
+}
+
+TEST(RowsOfAList, MayBeTakenOutByTheListsOwnDestructor) {
+    class OwningList : public ColumnListView {
+      public:
+        OwningList(CLVContainerView** container) : ColumnListView(BRect(0, 0, 99, 79), container, "list") {}
+        ~OwningList() override { MakeEmpty(); }
+        std::vector<std::unique_ptr<NotingRow>> rows;
+    };
+    CLVContainerView* container = nullptr;
+    auto* const list = new OwningList(&container);
+    list->AddColumn(new CLVColumn("Label", 200, 0, 20));
+    for (int i = 0; i < 20; ++i) {
+        list->rows.push_back(std::make_unique<NotingRow>(0));
+        list->AddItem(list->rows.back().get());
+    }
+    list->ScrollTo(BPoint(30, 40));
+
+    delete container;
 }
