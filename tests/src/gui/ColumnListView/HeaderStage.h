@@ -81,9 +81,23 @@ class HeaderStage : public ViewStage {
     // What the watchers see.
     void SetPointer(float x, uint32 buttons) {
         Locked([&] {
+            mLooks = 0;
             mPointer = header->ConvertToSurface(BPoint(x, 5));
             mButtons = buttons;
         });
+    }
+    // Until one has seen that, after a press: where a watcher looks first is where its watch begins.
+    void WaitForWatcher() {
+        for (int i = 0; i < 1000; ++i) {
+            int looks = 0;
+            Locked([&] { looks = mLooks; });
+            // The first look is that of the press itself.
+            if (looks > 1) {
+                return;
+            }
+            snooze(5000);
+        }
+        ADD_FAILURE() << "no watcher has looked";
     }
     void DrawAll() {
         Locked([&] { InvalidateTree(container); });
@@ -159,6 +173,7 @@ class HeaderStage : public ViewStage {
     bool GetMouse(BView* /*view*/, BPoint* surfacePoint, uint32* buttons, bool /*queue*/) override {
         *surfacePoint = mPointer;
         *buttons = mButtons;
+        ++mLooks;
         return true;
     }
     static void InvalidateTree(BView* view) {
@@ -170,4 +185,5 @@ class HeaderStage : public ViewStage {
 
     BPoint mPointer;
     uint32 mButtons = 0;
+    int mLooks = 0;
 };
