@@ -342,6 +342,10 @@ void run_display();
 void end_display_loop();
 // Called on the main thread when the desktop's session asks the program to end.
 void set_quit_handler(std::function<void()> handler);
+// Called on the main thread, in the middle of run_display(), when the display has gone: its server has ended,
+// or a window manager has cut the program off. The process ends with a line on standard error and exit status
+// 1 as the handler returns.
+void set_loss_handler(std::function<void()> handler);
 // Runs it on the main thread soon, in order with everything else that is asked for.
 void run_on_main_thread(std::function<void()> task);
 

@@ -9,12 +9,16 @@
 // runs an application object without graphics, text is measured by a rule of thumb and drawn as nothing:
 // fonts_available() tells.
 //
+// Widths and masks of the texts asked for lately are kept, up to a few megabytes, so that a list that is
+// drawn again costs only the copying of pixels.
+//
 // Text is UTF-8; what is not valid UTF-8 is shown as replacement characters, control characters as blanks.
 // Sizes, widths and heights are logical pixels.
 #pragma once
 
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -76,11 +80,11 @@ struct TextWindow {
 // point of a cluster (a letter with its combining marks) carries the whole cluster's advance.
 [[nodiscard]] std::vector<float> text_advances(const FontSpec& font, std::string_view text);
 
-// Draws the text with `scale` device pixels for one logical pixel (clamped to 0.25 .. 16). The mask lies
-// within the window, which must not be larger than 16384 pixels on a side; it is empty where nothing of the
-// text shows.
-[[nodiscard]] TextMask render_text(const FontSpec& font, std::string_view text, double scale,
-                                   TextWindow window);
+// Draws the text with `scale` device pixels for one logical pixel (clamped to 0.25 .. 16). The mask holds at
+// least what of the text lies within the window, which must not be larger than 16384 pixels on a side; null
+// where nothing of the text is inked.
+[[nodiscard]] std::shared_ptr<const TextMask> render_text(const FontSpec& font, std::string_view text,
+                                                          double scale, TextWindow window);
 
 // Names of the installed families, sorted, each once.
 [[nodiscard]] std::vector<std::string> font_families();

@@ -14,6 +14,7 @@
 #include <atomic>
 #include <cstdio>
 #include <cstdlib>
+#include <utility>
 
 namespace host {
 
@@ -25,6 +26,12 @@ std::function<void()>& quit_handler() {
     static auto* const handler = new std::function<void()>;
     return *handler;
 }
+
+std::function<void()>& loss_handler() {
+    static auto* const handler = new std::function<void()>;
+    return *handler;
+}
+QtMessageHandler usual_message_handler = nullptr;
 
 bool is_set(const char* variable) {
     const char* const value = std::getenv(variable);
@@ -47,6 +54,26 @@ void end_without_display(QtMsgType type, const QMessageLogContext& /*context*/, 
     if (type == QtCriticalMsg) {
         std::fprintf(stderr, "%s\n", text.toLocal8Bit().constData());
     }
+}
+
+// What Qt says, on X11 and on Wayland, before it ends the process from within its loop. Nothing else tells,
+// and threads that are at work would run on while everything is torn down around them.
+bool tells_of_loss(const QString& text) {
+    return text.contains(QLatin1String("connection broke")) ||
+           text.contains(QLatin1String("connection experienced a fatal error"));
+}
+
+void watch_for_loss(QtMsgType type, const QMessageLogContext& context, const QString& text) {
+    if (!MainThread::instance().is_current() || !tells_of_loss(text)) {
+        usual_message_handler(type, context, text);
+        return;
+    }
+    std::fprintf(stderr, "the display has gone\n");
+    if (loss_handler()) {
+        loss_handler()();
+    }
+    std::fflush(nullptr);
+    std::_Exit(EXIT_FAILURE);
 }
 
 void serve_session() {
@@ -81,6 +108,7 @@ bool connect_display(std::string* problem) {
     }
     set_double_click_time(
         static_cast<std::int64_t>(QGuiApplication::styleHints()->mouseDoubleClickInterval()) * 1000);
+    usual_message_handler = qInstallMessageHandler(watch_for_loss);
     serve_session();
     ScreenList::instance().follow();
     MainThread::instance().start();
@@ -112,6 +140,10 @@ void end_display_loop() {
 
 void set_quit_handler(std::function<void()> handler) {
     quit_handler() = std::move(handler);
+}
+
+void set_loss_handler(std::function<void()> handler) {
+    loss_handler() = std::move(handler);
 }
 
 void run_on_main_thread(std::function<void()> task) {

@@ -21,15 +21,16 @@ uint32 DividedBy255(uint32 value) {
     return (value + 127U) / 255U;
 }
 
+// Two components at once, in bits 0 to 7 and 16 to 23; each half divides by 255 as DividedBy255() does.
+uint32 MixPair(uint32 from, uint32 to, uint32 amount) {
+    const uint32 sums = from * (255U - amount) + to * amount + 0x007F007FU;
+    return ((sums + 0x00010001U + ((sums >> 8) & 0x00FF00FFU)) >> 8) & 0x00FF00FFU;
+}
+
 // `amount` of 255 gives `to`, 0 gives `from`; all four components.
 pixel32 Mix(pixel32 from, pixel32 to, uint32 amount) {
-    pixel32 mixed = 0;
-    for (uint32 shift = 0; shift < 32; shift += 8) {
-        const uint32 a = (from >> shift) & 255U;
-        const uint32 b = (to >> shift) & 255U;
-        mixed |= DividedBy255(a * (255U - amount) + b * amount) << shift;
-    }
-    return mixed;
+    return MixPair(from & 0x00FF00FFU, to & 0x00FF00FFU, amount) |
+           (MixPair((from >> 8) & 0x00FF00FFU, (to >> 8) & 0x00FF00FFU, amount) << 8);
 }
 
 template <typename Combine>

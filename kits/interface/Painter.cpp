@@ -260,13 +260,14 @@ void Painter::DrawText(const host::FontSpec& font, std::string_view text, double
     if (!visible.IsValid()) {
         return;
     }
-    const host::TextMask mask =
+    const std::shared_ptr<const host::TextMask> drawnText =
         host::render_text(font, text, mSurface.scale,
                           {visible.left - originX, visible.top - originY, visible.right + 1 - originX,
                            visible.bottom + 1 - originY});
-    if (mask.width == 0) {
+    if (drawnText == nullptr) {
         return;
     }
+    const host::TextMask& mask = *drawnText;
     const clipping_rect box = {originX + mask.left, originY + mask.top, originX + mask.left + mask.width - 1,
                                originY + mask.top + mask.height - 1};
     const bool copies = ink.blend.mode == B_OP_COPY;
@@ -283,6 +284,11 @@ void Painter::DrawText(const host::FontSpec& font, std::string_view text, double
                                     (drawn.left - box.left);
             if (!copies) {
                 BlendDeviceRow(drawn.left, row, count, mSource.data(), coverage, ink);
+                continue;
+            }
+            if (mSurface.space == B_RGB32 || mSurface.space == B_RGBA32) {
+                copy_text_row(ink.blend, coverage, reinterpret_cast<pixel32*>(mSurface.Row(row)) + drawn.left,
+                              count);
                 continue;
             }
             mTarget.resize(static_cast<size_t>(count));

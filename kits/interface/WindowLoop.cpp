@@ -9,6 +9,7 @@
 #include "host/api/display.h"
 #include "host/api/threads.h"
 
+#include <chrono>
 #include <cstdio>
 #include <string>
 
@@ -16,6 +17,9 @@ namespace {
 
 // How long a window may take to end when the application has ended already.
 constexpr bigtime_t kPatience = 3000000;
+
+// How long the application may take to end when its display has gone.
+constexpr bigtime_t kLongPatience = 10000000;
 
 // How long a window is waited for that is to come to the front.
 constexpr bigtime_t kShortPatience = 200000;
@@ -60,6 +64,9 @@ bool WindowLoop::Prepare() {
         return false;
     }
     host::set_quit_handler([] { be_app_messenger.SendMessage(B_QUIT_REQUESTED); });
+    host::set_loss_handler([this] { EndApplication(); });
+    GuardLock guard(mMutex);
+    mQuits = false;
     return true;
 }
 
@@ -71,6 +78,33 @@ bool WindowLoop::Run() {
 void WindowLoop::Quit() {
     QuitAllWindows();
     host::end_display_loop();
+    GuardLock guard(mMutex);
+    mQuits = true;
+    mQuitCalled.notify_all();
+}
+
+// The application is asked as the system asks it, and then goes here: main(), which has made it, has no turn
+// any more.
+void WindowLoop::EndApplication() {
+    BApplication* const application = be_app;
+    if (application == nullptr) {
+        return;
+    }
+    const thread_id thread = application->Thread();
+    (void)be_app_messenger.SendMessage(B_QUIT_REQUESTED);
+    if (!WaitForQuit(kLongPatience)) {
+        return;
+    }
+    wait_for_thread(thread, nullptr);
+    application->~BApplication();
+}
+
+bool WindowLoop::WaitForQuit(bigtime_t timeout) {
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::microseconds(timeout);
+    GuardLock guard(mMutex);
+    while (!mQuits && mQuitCalled.wait_until(guard.Native(), deadline) != std::cv_status::timeout) {
+    }
+    return mQuits;
 }
 
 void WindowLoop::Activate(const std::string&) {

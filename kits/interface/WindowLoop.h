@@ -3,6 +3,11 @@
 
 #include "MainLoop.h"
 
+#include <SupportDefs.h>
+#include <ThreadSafety.h>
+
+#include <condition_variable>
+
 // Installed by being linked: a program that knows BWindow has it from its start on. It runs the display's
 // events in the thread that calls BApplication::Run(), which must be the process's first, and ends it with
 // one line on standard error and exit status 1 when there is no display. What has to be there before the
@@ -21,4 +26,14 @@ class WindowLoop : public MainLoop {
 
     // Constructed once, before main().
     WindowLoop();
+
+  private:
+    // In the main thread, when the display has gone in the middle of Run().
+    void EndApplication();
+    // False when Quit() is not called in time.
+    bool WaitForQuit(bigtime_t timeout);
+
+    GuardMutex mMutex;
+    std::condition_variable mQuitCalled;
+    bool mQuits GUARDED_BY(mMutex) = false;
 };

@@ -171,6 +171,9 @@ void FileIndexWindow::UpdateButtons(FileIndexListItem* item) {
     mStripButton->SetEnabled(supported && !running);
     mIndexButton->SetEnabled(supported && !running);
     mStopButton->SetEnabled(supported && running);
+    // A button that is disabled loses the keyboard, which then goes to nobody by itself.
+    if (CurrentFocus() == nullptr)
+        mVolumeList->MakeFocus();
 }
 
 void FileIndexWindow::MessageReceived(BMessage* message) {

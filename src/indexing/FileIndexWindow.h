@@ -26,7 +26,8 @@ class FileIndexWindow : public BWindow {
 
     // Redraws the rows whose jobs are at work or have just ended.
     void Pulse();
-    // Enables what can be done with that row. Nothing for null.
+    // Enables what can be done with that row. Nothing for null. The list gets the keyboard where the button
+    // that had it is disabled.
     void UpdateButtons(FileIndexListItem* item);
 
     void MessageReceived(BMessage* message) override;

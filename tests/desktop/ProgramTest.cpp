@@ -52,6 +52,14 @@ class ProgramOnDesktop : public Indexer {
         return test::run_program(program, arguments);
     }
 
+    void ExpectEndWithoutDisplay() {
+        ASSERT_TRUE(Comes([&] { return !mProgram->running(); }));
+        const test::ProgramResult result = mProgram->wait();
+        EXPECT_EQ(result.status, 1) << "signal " << result.signal;
+        EXPECT_EQ(result.errors, "the display has gone\n");
+        EXPECT_EQ(result.output.find("Bye"), std::string::npos) << "that tells of a clean end";
+    }
+
     bool mLaunched = false;
 };
 
@@ -158,6 +166,38 @@ TEST_F(ProgramOnDesktop, OfTwoThatAreStartedAtOnceOneStays) {
             EXPECT_TRUE(result.output.ends_with("Bye !\n")) << result.output;
         }
     }
+}
+
+// As a window manager does with a program that does not answer.
+TEST_F(ProgramOnDesktop, CutOffFromTheDisplayItSavesItsSettings) {
+    StartWithFrame(211, 133, 517, 289);
+    std::filesystem::remove(SettingsPath());
+    Desktop().tool({"windowkill", mWindow});
+    ExpectEndWithoutDisplay();
+    EXPECT_EQ(SavedFrame(), BRect(211, 133, 728, 422));
+}
+
+TEST_F(ProgramOnDesktop, CutOffFromTheDisplayItStopsItsJobs) {
+    MakeFiles(30000);
+    Start();
+    Click(kIndex);
+    ASSERT_TRUE(Comes([] { return CountTagged() > 0; }));
+    Desktop().tool({"windowkill", mWindow});
+    ExpectEndWithoutDisplay();
+    const int tagged = CountTagged();
+    EXPECT_LT(tagged, 30000);
+    EXPECT_EQ(CountTagged(), tagged) << "nothing goes on";
+    Start();
+    End();
+}
+
+TEST_F(ProgramOnDesktop, CutOffFromTheDisplayWithTheAboutBoxOpenItEnds) {
+    Start();
+    ASSERT_EQ(Send("_ABR").status, 0);
+    ASSERT_TRUE(Comes([] { return CountAllWindows() == 2; }));
+    Desktop().tool({"windowkill", mWindow});
+    ExpectEndWithoutDisplay();
+    EXPECT_EQ(SavedFrame(), BRect(100, 100, 550, 300));
 }
 
 TEST_F(ProgramOnDesktop, WithoutADirectoryForSettingsItStartsAsAtFirst) {

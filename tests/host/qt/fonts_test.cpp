@@ -9,6 +9,14 @@ namespace {
 
 constexpr host::TextWindow kWide = {-1000, -1000, 1000, 1000};
 
+// The mask of a text of which something is inked; an empty one fails the test that asks for it.
+host::TextMask mask_of(const host::FontSpec& font, std::string_view text, double scale = 1.0,
+                       host::TextWindow window = kWide) {
+    const std::shared_ptr<const host::TextMask> mask = host::render_text(font, text, scale, window);
+    EXPECT_NE(mask, nullptr) << text;
+    return mask != nullptr ? *mask : host::TextMask{};
+}
+
 // The sum of all coverage bytes.
 long ink_of(const host::TextMask& mask) {
     return std::accumulate(mask.coverage.begin(), mask.coverage.end(), 0L);
@@ -110,19 +118,19 @@ TEST(Fonts, EachInvalidByteIsOneReplacementCharacter) {
     EXPECT_EQ(host::text_advances(font, "\xC0\xAF").size(), 2U) << "a slash in two bytes";
     EXPECT_EQ(host::text_advances(font, "\xF0\x9F\x8E").size(), 3U) << "cut short";
     EXPECT_EQ(host::text_advances(font, "\xF0\x9F\x8E\xB5").size(), 1U) << "a note, outside the first plane";
-    EXPECT_GT(ink_of(host::render_text(font, "\xFF", 1.0, kWide)), 0);
+    EXPECT_GT(ink_of(mask_of(font, "\xFF")), 0);
 }
 
 TEST(Fonts, ControlCharactersAreBlanks) {
     const host::FontSpec font;
     EXPECT_FLOAT_EQ(host::text_width(font, "a\nb"), host::text_width(font, "a b"));
     EXPECT_FLOAT_EQ(host::text_width(font, "a\tb"), host::text_width(font, "a b"));
-    EXPECT_EQ(ink_of(host::render_text(font, "\n\t\x01", 1.0, kWide)), 0);
+    EXPECT_EQ(host::render_text(font, "\n\t\x01", 1.0, kWide), nullptr);
 }
 
 TEST(Fonts, TextStaysWithinItsWidthAndHeight) {
     const host::FontSpec font;
-    const host::TextMask mask = host::render_text(font, "Hamburgefonts", 1.0, kWide);
+    const host::TextMask mask = mask_of(font, "Hamburgefonts");
     const host::FontHeight height = host::font_height(font);
     ASSERT_GT(ink_of(mask), 0);
     EXPECT_GE(first_inked_column(mask), -1);
@@ -130,31 +138,84 @@ TEST(Fonts, TextStaysWithinItsWidthAndHeight) {
     EXPECT_GE(static_cast<float>(first_inked_row(mask)), -height.ascent - 1);
 }
 
-TEST(Fonts, TheWindowCutsTheMask) {
+// The coverage at a place, wherever the mask's own edges lie.
+int coverage_at(const host::TextMask& mask, int x, int y) {
+    const bool inside =
+        x >= mask.left && x < mask.left + mask.width && y >= mask.top && y < mask.top + mask.height;
+    return inside ? mask.coverage[static_cast<std::size_t>((y - mask.top) * mask.width + x - mask.left)] : 0;
+}
+
+TEST(Fonts, TheMaskHoldsWhatLiesInTheWindow) {
     const host::FontSpec font;
-    const host::TextMask all = host::render_text(font, "Hamburgefonts", 1.0, kWide);
-    const host::TextMask part = host::render_text(font, "Hamburgefonts", 1.0, {10, -20, 30, 10});
-    ASSERT_GT(ink_of(part), 0);
-    EXPECT_EQ(part.left, 10);
-    EXPECT_EQ(part.width, 20);
-    for (int y = part.top; y < part.top + part.height; ++y) {
-        for (int x = part.left; x < part.left + part.width; ++x) {
-            const auto at = [&](const host::TextMask& mask) {
-                const int row = y - mask.top;
-                return row < 0 || row >= mask.height
-                           ? 0
-                           : mask.coverage[static_cast<std::size_t>(row * mask.width + x - mask.left)];
-            };
-            ASSERT_EQ(at(all), at(part)) << x << ", " << y;
+    // The longer one is too large to be kept, and drawn only as far as the window reaches.
+    std::string long_text;
+    for (int i = 0; i < 400; ++i) {
+        long_text += "Hamburgefonts ";
+    }
+    for (const std::string& text : {std::string("Hamburgefonts"), long_text}) {
+        const host::TextMask wide = mask_of(font, text);
+        const host::TextWindow window{10, -20, 30, 10};
+        const host::TextMask part = mask_of(font, text, 1.0, window);
+        for (int y = window.top; y < window.bottom; ++y) {
+            for (int x = window.left; x < window.right; ++x) {
+                ASSERT_EQ(coverage_at(wide, x, y), coverage_at(part, x, y)) << x << ", " << y;
+            }
         }
     }
-    EXPECT_EQ(host::render_text(font, "x", 1.0, {500, 500, 600, 600}).width, 0);
+    EXPECT_EQ(host::render_text(font, long_text, 1.0, {500, 500, 600, 600}), nullptr);
+}
+
+TEST(Fonts, TheMaskHasNoEmptyEdges) {
+    const host::TextMask mask = mask_of({}, "  Hamburgefonts  ");
+    EXPECT_EQ(first_inked_column(mask), mask.left);
+    EXPECT_EQ(last_inked_column(mask), mask.left + mask.width - 1);
+    EXPECT_EQ(first_inked_row(mask), mask.top);
+}
+
+TEST(Fonts, ATextIsTheSameEachTimeItIsAskedFor) {
+    const host::FontSpec plain;
+    host::FontSpec bold;
+    bold.weight = 700;
+    host::FontSpec large;
+    large.size = 20;
+    // Each of them between the others, so that none is answered with another's pixels.
+    struct Asked {
+        host::FontSpec font;
+        double scale;
+        host::TextMask mask;
+        float width;
+    };
+    std::vector<Asked> all;
+    for (const host::FontSpec& font : {plain, bold, large}) {
+        for (const double scale : {1.0, 1.5}) {
+            all.push_back({font, scale, mask_of(font, "Song", scale), host::text_width(font, "Song")});
+        }
+    }
+    for (std::size_t i = 0; i < all.size(); ++i) {
+        const host::TextMask again = mask_of(all[i].font, "Song", all[i].scale);
+        EXPECT_EQ(again.coverage, all[i].mask.coverage) << i;
+        EXPECT_EQ(again.left, all[i].mask.left) << i;
+        EXPECT_EQ(again.top, all[i].mask.top) << i;
+        EXPECT_EQ(host::text_width(all[i].font, "Song"), all[i].width) << i;
+        for (std::size_t other = 0; other < i; ++other) {
+            EXPECT_NE(all[other].mask.coverage, all[i].mask.coverage) << i << ", " << other;
+        }
+    }
+}
+
+TEST(Fonts, AdvancesDoNotDependOnWhatWasAskedBefore) {
+    const host::FontSpec font;
+    const std::vector<float> first = host::text_advances(font, "Tofi");
+    EXPECT_GT(ink_of(mask_of(font, "Tofi")), 0);
+    EXPECT_GT(host::text_width(font, "Tofi"), 0);
+    EXPECT_EQ(host::text_advances(font, "Tofi"), first);
+    EXPECT_EQ(first.size(), 4U);
 }
 
 TEST(Fonts, AScaledTextIsAsMuchLarger) {
     const host::FontSpec font;
-    const host::TextMask once = host::render_text(font, "Hamburgefonts", 1.0, kWide);
-    const host::TextMask twice = host::render_text(font, "Hamburgefonts", 2.0, kWide);
+    const host::TextMask once = mask_of(font, "Hamburgefonts");
+    const host::TextMask twice = mask_of(font, "Hamburgefonts", 2.0);
     const int narrow = last_inked_column(once) - first_inked_column(once);
     const int wide = last_inked_column(twice) - first_inked_column(twice);
     EXPECT_NEAR(wide, 2 * narrow, 6);
@@ -164,11 +225,10 @@ TEST(Fonts, AScaledTextIsAsMuchLarger) {
 TEST(Fonts, BoldIsHeavierAndWithoutAntialiasingThereIsNoGrey) {
     host::FontSpec bold;
     bold.weight = 700;
-    EXPECT_GT(ink_of(host::render_text(bold, "Hello", 1.0, kWide)),
-              ink_of(host::render_text({}, "Hello", 1.0, kWide)));
+    EXPECT_GT(ink_of(mask_of(bold, "Hello")), ink_of(mask_of(host::FontSpec{}, "Hello")));
     host::FontSpec hard;
     hard.antialiased = false;
-    const host::TextMask mask = host::render_text(hard, "Hello", 1.0, kWide);
+    const host::TextMask mask = mask_of(hard, "Hello");
     EXPECT_TRUE(std::all_of(mask.coverage.begin(), mask.coverage.end(),
                             [](std::uint8_t c) { return c == 0 || c == 255; }));
 }
@@ -183,14 +243,22 @@ TEST(Fonts, SillySizesAreKeptInBounds) {
 
 TEST(Fonts, SeveralThreadsDrawAtOnce) {
     const host::FontSpec font;
-    const host::TextMask expected = host::render_text(font, "Hamburgefonts", 1.0, kWide);
+    const host::TextMask expected = mask_of(font, "Hamburgefonts");
     std::vector<int> wrong(4, 0);
     std::vector<std::thread> threads;
     for (std::size_t t = 0; t < wrong.size(); ++t) {
         threads.emplace_back([&, t] {
             for (int i = 0; i < 50; ++i) {
-                wrong[t] +=
-                    host::render_text(font, "Hamburgefonts", 1.0, kWide).coverage != expected.coverage;
+                // Once a text that all threads draw, once one that is drawn for the first time.
+                const std::string number = std::to_string(static_cast<int>(t) * 50 + i);
+                for (const std::string& text : {std::string("Hamburgefonts"), "Hamburgefonts   " + number}) {
+                    const host::TextMask mask = mask_of(font, text);
+                    for (int x = expected.left; x < expected.left + expected.width; ++x) {
+                        for (int y = expected.top; y < expected.top + expected.height; ++y) {
+                            wrong[t] += coverage_at(mask, x, y) != coverage_at(expected, x, y) ? 1 : 0;
+                        }
+                    }
+                }
             }
         });
     }

@@ -148,6 +148,20 @@ TEST_F(IndexerWindow, ButtonsStayAsTheyAreWithoutASelection) {
     });
 }
 
+TEST_F(IndexerWindow, TheListGetsTheKeyboardOfAButtonThatIsDisabled) {
+    Open();
+    WithWindow([&] { Button("index")->MakeFocus(); });
+    Select(kSecondRow);
+    WithWindow([&] { EXPECT_TRUE(Button("index")->IsFocus()) << "it is still enabled"; });
+    Post(710);
+    WithWindow([&] {
+        EXPECT_TRUE(List()->IsFocus());
+        Button("stop")->MakeFocus();
+    });
+    Post(712);
+    WithWindow([&] { EXPECT_TRUE(List()->IsFocus()); });
+}
+
 TEST_F(IndexerWindow, IndexesAndStripsTheSelectedVolume) {
     MakeFiles(3);
     Open();

@@ -11,7 +11,9 @@
 class NumberedRow : public CLVListItem {
   public:
     explicit NumberedRow(int rowNumber, uint32 level = 0, bool expanded = true, float height = 19)
-        : CLVListItem(level, false, expanded, height), number(rowNumber), mHeight(height) {}
+        : CLVListItem(level, false, expanded, height), number(rowNumber), mHeight(height) {
+        SetHeight(height);
+    }
     void DrawItemColumn(BView* /*owner*/, BRect /*rect*/, int32 columnIndex, bool /*complete*/) override {
         drawnColumns.push_back(columnIndex);
     }
