@@ -46,11 +46,12 @@ bool fonts_available() {
 }
 
 FontHeight font_height(const FontSpec& font) {
-    const FontKey key = font_key(font);
     if (!fonts_available()) {
-        const float size = static_cast<float>(key.size);
+        const float size = static_cast<float>(font_key(font).size);
         return {size * 0.9F, size * 0.25F, 0};
     }
+    // Not before there are fonts: the desktop's families are not known until then.
+    const FontKey key = font_key(font);
     if (const std::optional<FontHeight> known = texts().find_height(key)) {
         return *known;
     }

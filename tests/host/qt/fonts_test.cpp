@@ -1,6 +1,7 @@
 #include "host/api/fonts.h"
 
 #include <algorithm>
+#include <cstdlib>
 #include <gtest/gtest.h>
 #include <numeric>
 #include <thread>
@@ -53,6 +54,18 @@ int first_inked_row(const host::TextMask& mask) {
         }
     }
     return -100000;
+}
+
+// In a process of its own: the first question of all is the one.
+TEST(Fonts, AreAsHighWhenTheyAreFirstAskedForAsEverAfter) {
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    EXPECT_EXIT(
+        {
+            const host::FontHeight first = host::font_height({});
+            const host::FontHeight second = host::font_height({});
+            std::_Exit(first.ascent == second.ascent && first.descent == second.descent ? 0 : 1);
+        },
+        ::testing::ExitedWithCode(0), "");
 }
 
 TEST(Fonts, AreThereWithoutADisplay) {
