@@ -220,7 +220,8 @@ BRect BListView::ItemFrame(int32 index) {
         return {};
     }
     TakeHeightFromRow(index);
-    const auto top = static_cast<float>(mPositions->TopOf(index));
-    const auto pixels = static_cast<float>(mPositions->HeightOf(index));
-    return {0, top, std::max(0.0F, Bounds().right), top + pixels - 1};
+    // Each edge is rounded once: far down, floats do not know every pixel.
+    const int64 top = mPositions->TopOf(index);
+    const int64 bottom = top + mPositions->HeightOf(index) - 1;
+    return {0, static_cast<float>(top), std::max(0.0F, Bounds().right), static_cast<float>(bottom)};
 }

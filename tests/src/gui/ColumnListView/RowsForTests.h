@@ -1,4 +1,4 @@
-// Rows of a column list that know their number and draw nothing.
+// Rows of a column list that know their number and are drawn white.
 #pragma once
 
 #include "gui/ColumnListView/CLVListItem.h"
@@ -14,8 +14,12 @@ class NumberedRow : public CLVListItem {
         : CLVListItem(level, false, expanded, height), number(rowNumber), mHeight(height) {
         SetHeight(height);
     }
-    void DrawItemColumn(BView* /*owner*/, BRect /*rect*/, int32 columnIndex, bool /*complete*/) override {
+    void DrawItemColumn(BView* owner, BRect rect, int32 columnIndex, bool complete) override {
         drawnColumns.push_back(columnIndex);
+        if (complete) {
+            owner->SetHighColor(255, 255, 255);
+            owner->FillRect(rect);
+        }
     }
     void Update(BView* owner, const BFont* /*font*/) override {
         SetHeight(mHeight);
