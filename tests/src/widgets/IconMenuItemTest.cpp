@@ -6,6 +6,8 @@
 #include <Application.h>
 #include <Bitmap.h>
 #include <Menu.h>
+#include <Messenger.h>
+#include <Roster.h>
 
 #include <gtest/gtest.h>
 
@@ -179,4 +181,30 @@ TEST_F(IconMenuItemTest, ShowingAFileSendsItsRefToTracker) {
     user.join();
 
     EXPECT_EQ(ref, tracker.ref);
+}
+
+TEST_F(IconMenuItemTest, ShowingAFileStartsTrackerWhereItDoesNotRun) {
+    // A program that notes what it gets is installed in Tracker's place.
+    const std::string records = mEnvironment.home() + "/.local/share/bekits/applications";
+    std::filesystem::create_directories(records);
+    test::write_file(records + "/application,x-vnd.be-trak.app",
+                     "[Application]\nSignature=application/x-vnd.Be-TRAK\nExecutable=" +
+                         std::string(TEST_PEER) + "\nLaunch=exclusive\n");
+    const std::string log = mEnvironment.root() + "/log";
+    mEnvironment.set("TEST_PEER_LOG", log);
+    mEnvironment.set("TEST_PEER_SIGNATURE", "application/x-vnd.Be-TRAK");
+    const auto logs = [&log](const std::string& text) {
+        for (int i = 0; i < 1000 && test::read_file(log).find(text + "\n") == std::string::npos; ++i)
+            snooze(20000);
+        return test::read_file(log).find(text + "\n") != std::string::npos;
+    };
+    const BEntry entry(MakeFile("Song.mp3").c_str());
+    IconMenuItem item(&entry);
+    ASSERT_FALSE(be_roster->IsRunning("application/x-vnd.Be-TRAK"));
+
+    item.ShowInTracker();
+
+    EXPECT_TRUE(logs("refs Song.mp3"));
+    BMessenger("application/x-vnd.Be-TRAK").SendMessage(B_QUIT_REQUESTED);
+    EXPECT_TRUE(logs("ended"));
 }
