@@ -141,5 +141,6 @@ void QuirnelApp::AboutRequested() {
                                    "Contact: see the README that comes with it\n"
                                    "Freeware",
                                    "", nullptr, nullptr, B_WIDTH_AS_USUAL, B_INFO_ALERT);
+    alert->SetShortcut(0, B_ESCAPE);
     alert->Go();
 }

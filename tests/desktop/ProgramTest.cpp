@@ -77,7 +77,7 @@ TEST_F(ProgramOnDesktop, AWindowThatIsNotThereYetIsSpokenOfOnce) {
         << said;
 }
 
-TEST_F(ProgramOnDesktop, TheAboutBoxHasOneButtonWithoutALabelAndGoesOnReturn) {
+TEST_F(ProgramOnDesktop, TheAboutBoxHasOneButtonWithoutALabelAndGoesOnReturnAndEscape) {
     Start();
     ASSERT_EQ(Send("_ABR").status, 0);
     ASSERT_TRUE(Comes([] { return CountAllWindows() == 2; }));
@@ -89,7 +89,7 @@ TEST_F(ProgramOnDesktop, TheAboutBoxHasOneButtonWithoutALabelAndGoesOnReturn) {
     ASSERT_EQ(Send("_ABR").status, 0);
     EXPECT_TRUE(Comes([] { return CountAllWindows() == 2; }));
     usleep(500000);
-    Press("space");
+    Press("Escape");
     EXPECT_TRUE(Comes([] { return CountAllWindows() == 1; }));
     End();
 }
