@@ -28,6 +28,9 @@ constexpr bigtime_t kPulseRate = 200000;
 constexpr float kNoLimit = 1000000;
 // Around the list and the buttons, and between them.
 constexpr float kInset = 7;
+// A button is as wide as its share of the window, within these. The least one shows the longest label, also
+// in a window that was opened too small for it, which can grow.
+constexpr float kMinButtonWidth = 50;
 constexpr float kMaxButtonWidth = 80;
 
 BButton* AddButton(BView* parent, BRect frame, const char* name, const char* label, uint32 code) {
@@ -90,7 +93,8 @@ void FileIndexWindow::AddViews() {
 
     BRect button = inside;
     button.top = button.bottom - PreferredButtonHeight();
-    button.right = button.left + std::min(std::floor((inside.Width() - 3 * kInset) / 4), kMaxButtonWidth);
+    button.right = button.left + std::clamp(std::floor((inside.Width() - 3 * kInset) / 4), kMinButtonWidth,
+                                            kMaxButtonWidth);
 
     // Before the buttons, as the keyboard goes through the views in their order.
     constexpr float kBorder = 2;

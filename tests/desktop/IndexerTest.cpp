@@ -56,6 +56,18 @@ TEST_F(Indexer, ASavedFrameThatLeavesTheScreenIsReplaced) {
     End();
 }
 
+TEST_F(Indexer, SavedAsASinglePixelItCanBeGrownAndUsed) {
+    MakeFiles(2);
+    StartWithFrame(211, 133, 0, 0);
+    EXPECT_EQ(WindowArea(), (Area{211, 133, 1, 1}));
+    Resize(451, 201);
+    KeepPicture("grown");
+    // The middle of the fourth button; they are 51 pixels wide and 7 apart.
+    Desktop().click(211 + 7 + 3 * 58 + 25, 133 + 201 - 18);
+    EXPECT_TRUE(WaitUntilTagged(2));
+    End();
+}
+
 TEST_F(Indexer, CannotBeMadeSmallerThanItOpened) {
     Start();
     Resize(200, 100);
