@@ -126,8 +126,15 @@ void BListView::MakeFocus(bool focus) {
 }
 
 void BListView::SetFont(const BFont* font, uint32 mask) {
+    BFont before;
+    GetFont(&before);
     BView::SetFont(font, mask);
-    UpdateAllRows();
+    BFont after;
+    GetFont(&after);
+    // Rows that set their font each time they are drawn shall not have everything drawn anew each time.
+    if (after != before) {
+        UpdateAllRows();
+    }
 }
 
 void BListView::ScrollTo(BPoint where) {
