@@ -112,8 +112,11 @@ void WindowEvents::scale_changed(double scale) {
 }
 
 void WindowEvents::margins_changed(host::FrameMargins margins) {
-    GuardLock guard(mMutex);
-    mMargins = margins;
+    {
+        GuardLock guard(mMutex);
+        mMargins = margins;
+    }
+    Post(BMessage(kWindowMarginsChanged));
 }
 
 void WindowEvents::activated(bool active) {
@@ -171,6 +174,14 @@ void WindowEvents::text_committed(const std::string& text) {
     for (const BMessage& message : TextMessages(text)) {
         Post(message);
     }
+}
+
+void WindowEvents::text_composed(const std::string& text, int caret) {
+    BMessage message(B_INPUT_METHOD_EVENT);
+    message.AddInt32("be:opcode", B_INPUT_METHOD_CHANGED);
+    message.AddString("be:string", text.c_str());
+    message.AddInt32("be:selection", caret);
+    Post(message);
 }
 
 void WindowEvents::drag(const host::DragInput& input) {
