@@ -38,6 +38,10 @@ void unregister_application();
 /// Those that run, this process's included, the one that began first in front.
 std::vector<RunningApplication> running_applications();
 
+/// Whether a process that has sent something to this one, or run an application, lives; this process does.
+/// False also when that cannot be found out.
+bool process_lives(std::int32_t process);
+
 /// From now on, calls for each application that begins or ends, within a second when its process was killed,
 /// until the process ends. Calls come in the transport's own thread and must not wait. One watcher in a
 /// process; another one takes its place, an empty one ends the watch.

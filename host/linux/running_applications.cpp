@@ -236,6 +236,13 @@ std::vector<RunningApplication> running_applications() {
     return all;
 }
 
+bool process_lives(std::int32_t process) {
+    if (process == ::getpid())
+        return true;
+    const Result<Descriptor> directory = open_runtime_directory();
+    return directory.ok() && team_lives(*directory, process);
+}
+
 Status watch_running_applications(ApplicationWatcher watcher) {
     return Watching::instance().set(std::move(watcher));
 }

@@ -1,5 +1,6 @@
 #include "Opener.h"
 
+#include "ErrorLine.h"
 #include "host/api/desktop_programs.h"
 #include "host/api/file_manager.h"
 #include "host/api/file_system.h"
@@ -8,7 +9,6 @@
 #include <Roster.h>
 
 #include <algorithm>
-#include <cstdio>
 
 namespace {
 
@@ -19,22 +19,8 @@ struct Entry {
     bool isFolder = false;
 };
 
-// Names are bytes; a line must stay one, and a terminal unharmed.
-std::string Printable(const std::string& name) {
-    constexpr char kDigits[] = "0123456789abcdef";
-    std::string text;
-    for (const char letter : name) {
-        const auto byte = static_cast<unsigned char>(letter);
-        if (byte >= ' ' && byte != 0x7f)
-            text += letter;
-        else
-            text += std::string("\\x") + kDigits[byte >> 4] + kDigits[byte & 15];
-    }
-    return text;
-}
-
 void Say(const std::string& text) {
-    std::fprintf(stderr, "tracker: %s\n", text.c_str());
+    SayError("tracker", text);
 }
 
 Entry Look(const entry_ref& ref) {
@@ -47,7 +33,7 @@ Entry Look(const entry_ref& ref) {
     const auto stat =
         target ? host::file_system().stat(*target) : host::Result<host::NodeStat>(target.status());
     if (!stat) {
-        Say(Printable(ref.name != nullptr ? ref.name : "") + ": is not there");
+        Say(PrintableName(ref.name != nullptr ? ref.name : "") + ": is not there");
         return entry;
     }
     entry.path = *path;
@@ -70,7 +56,7 @@ bool OpenWithHelper(const std::string& path) {
         start.arguments = helper.arguments;
         const auto process = host::start_process(start, [path, name = helper.name](int status) {
             if (status != 0)
-                Say(Printable(path) + ": " + name + " could not open it");
+                Say(PrintableName(path) + ": " + name + " could not open it");
         });
         if (process)
             return true;
@@ -83,7 +69,7 @@ void OpenFolders(const std::vector<std::string>& paths) {
         return;
     for (const std::string& path : paths) {
         if (!OpenWithHelper(path))
-            Say(Printable(path) + ": there is no file manager to open it");
+            Say(PrintableName(path) + ": there is no file manager to open it");
     }
 }
 
@@ -92,14 +78,14 @@ void OpenFile(const Entry& file) {
     status_t status = be_roster->FindApp(&file.ref, &program);
     if (status == B_OK && program == file.ref) {
         if (!host::show_entries({file.path}).ok())
-            Say(Printable(file.path) + ": is a program, which is not run from here");
+            Say(PrintableName(file.path) + ": is a program, which is not run from here");
         return;
     }
     if (status == B_OK)
         status = be_roster->Launch(&file.ref);
     if (status == B_OK || status == B_ALREADY_RUNNING || OpenWithHelper(file.path))
         return;
-    Say(Printable(file.path) + ": " + strerror(status));
+    Say(PrintableName(file.path) + ": " + strerror(status));
 }
 
 } // namespace

@@ -1,5 +1,6 @@
 // The listening side of the transport, against peers that do not keep to the rules.
 #include "host/api/local_transport.h"
+#include "host/api/running_applications.h"
 #include "host/api/threads.h"
 #include "host/linux/frame.h"
 #include "host/linux/local_peers.h"
@@ -7,7 +8,9 @@
 #include "support/temporary_environment.h"
 
 #include <atomic>
+#include <csignal>
 #include <cstring>
+#include <fcntl.h>
 #include <filesystem>
 #include <gtest/gtest.h>
 #include <poll.h>
@@ -181,6 +184,32 @@ TEST_F(LocalTransportTest, WhatADeadProcessLeftIsRemovedAndTheLivingStays) {
     EXPECT_TRUE(std::filesystem::exists(socket_name()));
     EXPECT_EQ(served(), 5);
     EXPECT_EQ(host::send_local_request(99999999, {}, host::uptime_nanoseconds() + second).error(), ESRCH);
+}
+
+TEST_F(LocalTransportTest, AProcessLivesAsLongAsItHoldsItsFile) {
+    mkdir(directory().c_str(), 0700);
+    EXPECT_TRUE(host::process_lives(getpid()));
+    // The parent takes no part, and nobody holds the file of the other.
+    test::write_file(directory() + "/99999999.team", "bekits-application 1\n");
+    EXPECT_FALSE(host::process_lives(getppid()));
+    EXPECT_FALSE(host::process_lives(99999999));
+    const pid_t child = fork();
+    if (child == 0) {
+        const int file =
+            open((directory() + "/" + std::to_string(getpid()) + ".team").c_str(), O_RDWR | O_CREAT, 0600);
+        struct flock lock = {};
+        lock.l_type = F_WRLCK;
+        lock.l_whence = SEEK_SET;
+        fcntl(file, F_SETLK, &lock);
+        pause();
+        _exit(0);
+    }
+    for (int round = 0; round < 1000 && !host::process_lives(child); ++round)
+        usleep(5000);
+    EXPECT_TRUE(host::process_lives(child));
+    kill(child, SIGKILL);
+    waitpid(child, nullptr, 0);
+    EXPECT_FALSE(host::process_lives(child));
 }
 
 TEST_F(LocalTransportTest, AnotherUserIsRefusedEvenWhereTheDirectoryIsOpen) {
