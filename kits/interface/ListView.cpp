@@ -126,15 +126,8 @@ void BListView::MakeFocus(bool focus) {
 }
 
 void BListView::SetFont(const BFont* font, uint32 mask) {
-    BFont before;
-    GetFont(&before);
     BView::SetFont(font, mask);
-    BFont after;
-    GetFont(&after);
-    // Rows that set their font each time they are drawn shall not have everything drawn anew each time.
-    if (after != before) {
-        UpdateAllRows();
-    }
+    UpdateAllRows();
 }
 
 void BListView::ScrollTo(BPoint where) {

@@ -2,13 +2,9 @@
 
 #include "LooperHold.h"
 #include "MenuLayout.h"
-#include "MenuPlacement.h"
-#include "MenuWindow.h"
 
 #include <MenuBar.h>
 #include <MenuItem.h>
-
-#include <algorithm>
 
 namespace {
 
@@ -52,9 +48,7 @@ BMenu::BMenu(BMessage* archive) : BView(archive) {
     }
 }
 
-BMenu::~BMenu() {
-    mShownAlone.reset();
-}
+BMenu::~BMenu() = default;
 
 void BMenu::Initialise() {
     mMargins = std::make_unique<MenuMargins>(kUsualMargins);
@@ -172,8 +166,6 @@ void BMenu::SetRadioMode(bool radioMode) {
     mRadioMode = radioMode;
     if (!radioMode) {
         mLabelFromMarked = false;
-    } else if (BMenuItem* const marked = FindMarked(); marked != nullptr) {
-        ItemMarked(marked);
     }
 }
 
@@ -227,51 +219,10 @@ bool BMenu::AddDynamicItem(add_state /*state*/) {
     return false;
 }
 
-bool BMenu::AddDynamicItems(const std::function<bool()>& userLeaves) {
+void BMenu::AddDynamicItems() {
     for (bool more = AddDynamicItem(B_INITIAL_ADD); more;) {
-        if (userLeaves()) {
-            AddDynamicItem(B_ABORT);
-            return false;
-        }
         more = AddDynamicItem(B_PROCESSING);
     }
-    return true;
-}
-
-void BMenu::Show() {
-    Show(false);
-}
-
-void BMenu::Show(bool selectFirst) {
-    if (Host() != nullptr) {
-        BView::Show();
-        return;
-    }
-    (void)AddDynamicItems([] { return false; });
-    LayoutItems();
-    auto shown = std::make_unique<MenuWindows>(std::make_shared<MenuEvents>());
-    const BPoint where = ScreenLocation();
-    const MenuPane pane(pop_up_frame(where, MenuPane::OuterSide(mContentSize.x),
-                                     MenuPane::OuterSide(mContentSize.y), shown->Screen(where)),
-                        mContentSize.y);
-    if (CountItems() == 0 || !shown->Show(this, pane)) {
-        return;
-    }
-    mShownAlone = std::move(shown);
-    const auto first =
-        std::find_if(mItems.begin(), mItems.end(), [](const auto& item) { return item->IsEnabled(); });
-    if (selectFirst && first != mItems.end()) {
-        SelectItem(first->get());
-    }
-}
-
-void BMenu::Hide() {
-    if (mShownAlone == nullptr) {
-        BView::Hide();
-        return;
-    }
-    SelectItem(nullptr);
-    mShownAlone.reset();
 }
 
 BPoint BMenu::ScreenLocation() {

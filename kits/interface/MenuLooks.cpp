@@ -5,7 +5,6 @@
 #include "LooperHold.h"
 #include "MenuLayout.h"
 #include "MenuTriggers.h"
-#include "MenuWindow.h"
 
 #include <MenuItem.h>
 
@@ -32,9 +31,6 @@ void BMenu::InvalidateLayout() {
     if (Host() != nullptr) {
         LayoutItems();
         Invalidate();
-        if (auto* const window = dynamic_cast<MenuWindow*>(Window()); window != nullptr) {
-            window->MenuChanged();
-        }
     }
 }
 

@@ -103,9 +103,7 @@ void BTextView::Initialise() {
 
 void BTextView::AttachedToWindow() {
     BView::AttachedToWindow();
-    if (mSelectable || mEditable) {
-        SetViewCursor(B_CURSOR_I_BEAM);
-    }
+    SetViewCursor(B_CURSOR_I_BEAM);
     LayOut();
 }
 
@@ -143,7 +141,6 @@ void BTextView::MakeFocus(bool focus) {
         return;
     }
     mHistory.EndRun();
-    EndComposition();
     ShowCaret();
     InvalidateText();
     if (mScrollView != nullptr) {

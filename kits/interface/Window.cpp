@@ -168,10 +168,6 @@ BView* BWindow::LastMouseMovedView() const {
 
 void BWindow::Show() {
     if (++mShowLevel == 1) {
-        mTitleToCheck = mHost->Margins() == WindowGeometry::Margins();
-        if (!mTitleToCheck) {
-            KeepTitleInReach();
-        }
         mHost->SetShown(true);
     }
     if (!IsRunning()) {
@@ -201,15 +197,15 @@ void BWindow::Activate(bool active) {
         mMinimized = false;
         mHost->Peer()->activate();
     } else {
-        mHost->Peer()->send_behind(nullptr);
+        mHost->Peer()->send_behind();
     }
 }
 
 status_t BWindow::SendBehind(const BWindow* window) {
-    if (window == this) {
-        return B_BAD_VALUE;
+    if (window != nullptr) {
+        return B_UNSUPPORTED;
     }
-    mHost->Peer()->send_behind(window != nullptr ? window->mHost->Peer() : nullptr);
+    mHost->Peer()->send_behind();
     return B_OK;
 }
 

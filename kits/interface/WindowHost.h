@@ -2,7 +2,6 @@
 #pragma once
 
 #include "MouseTracking.h"
-#include "RectTracking.h"
 #include "Shortcuts.h"
 #include "UpdateRegions.h"
 #include "ViewHost.h"
@@ -46,8 +45,6 @@ class WindowHost : public ViewHost {
     void EventMaskChanged(BView* view) override;
     void SetViewCursor(BView* view, const BCursor* cursor) override;
     void StartDrag(const DragStart& drag) override;
-    void BeginRectTracking(BRect rect, uint32 style) override;
-    void EndRectTracking() override;
     bool UnusedKey(BView* view, const char* bytes, int32 numBytes) override;
     void SetTextCaret(BView* view, BRect caret) override;
 
@@ -119,9 +116,6 @@ class WindowHost : public ViewHost {
     void RefreshPulse();
     void RefreshCursor(BView* under);
     void RefreshTextInput();
-    BPoint LivePointer() const;
-    void OutlineMoved(const std::vector<clipping_rect>& before);
-    void TrackPointer(BPoint place);
     bool InvokeShortcut(uint32 key, uint32 modifiers);
     bool InvokeUsualShortcut(uint32 key, uint32 modifiers);
     bool MoveFocus(bool groups, bool backward);
@@ -149,7 +143,6 @@ class WindowHost : public ViewHost {
     int32 mMessageDepth = 0;
 
     MouseTracking mMouse;
-    RectTracking mOutline;
     // The data of the drag above the window, turned into a message once.
     int32 mDragNumber = 0;
     std::unique_ptr<BMessage> mDragMessage;

@@ -27,3 +27,4 @@ int QueryFiles(const Request& request, Output& output);
 int ShowAttributes(const Request& request, Output& output);
 int SetCover(const Request& request, Output& output);
 int SendCode(const Request& request, Output& output);
+int ControlLayer(const Request& request, Output& output);

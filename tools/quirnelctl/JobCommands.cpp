@@ -1,38 +1,16 @@
 #include "Commands.h"
 #include "Interruption.h"
+#include "ProgressLine.h"
 #include "VolumeChoice.h"
 #include "indexing/FileIndexListItem.h"
 #include <OS.h>
 #include <Query.h>
-#include <cstdio>
-#include <unistd.h>
 
 namespace {
 
 enum class Job { index, strip };
 
 constexpr bigtime_t kPollInterval = 20'000; // microseconds
-
-/// One line on a terminal, written over itself; nothing where standard error is no terminal.
-class ProgressLine {
-  public:
-    ~ProgressLine() { Clear(); }
-    void Show(const std::string& text) {
-        if (!mIsTerminal || text == mShown)
-            return;
-        std::fprintf(stderr, "\r\033[K%s", text.c_str());
-        mShown = text;
-    }
-    void Clear() {
-        if (!mShown.empty())
-            std::fputs("\r\033[K", stderr);
-        mShown.clear();
-    }
-
-  private:
-    bool mIsTerminal = isatty(STDERR_FILENO) == 1;
-    std::string mShown;
-};
 
 std::unique_ptr<FileIndexListItem> RowFor(const ChosenVolume& volume) {
     auto entry = std::make_unique<VolumeListEntry>();

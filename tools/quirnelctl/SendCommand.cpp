@@ -1,4 +1,5 @@
 #include "Commands.h"
+#include "Programs.h"
 #include "app/QuirnelApp.h"
 #include <Errors.h>
 #include <Messenger.h>
@@ -27,18 +28,6 @@ std::optional<std::uint32_t> CodeOf(std::string text) {
     return code;
 }
 
-std::string ProblemOf(const std::string& signature, status_t status) {
-    const std::string application = Printable(signature);
-    switch (status) {
-    case B_LAUNCH_FAILED_APP_NOT_FOUND:
-        return application + " is not installed";
-    case B_TIMED_OUT:
-        return application + " does not answer";
-    default:
-        return application + ": " + strerror(status);
-    }
-}
-
 } // namespace
 
 int SendCode(const Request& request, Output& output) {
@@ -53,17 +42,14 @@ int SendCode(const Request& request, Output& output) {
     if (!be_roster->IsRunning(signature.c_str())) {
         if (!request.launch)
             return Fail(Printable(signature) + " is not running");
-        const status_t status = be_roster->Launch(signature.c_str());
-        if (status != B_OK && status != B_ALREADY_RUNNING)
-            return Fail(ProblemOf(signature, status));
-        launched = status == B_OK;
+        if (const std::string problem = StartProgram(signature, LaunchedErrors::shown, launched);
+            !problem.empty())
+            return Fail(problem);
     }
     BMessage message(*code);
     const BMessenger application(signature.c_str());
     // Nobody here waits for an answer.
     const status_t status = application.SendMessage(&message, BMessenger(), kPatience);
-    if (status == B_BAD_PORT_ID || status == B_BAD_TEAM_ID)
-        return Fail(Printable(signature) + " is not running");
     if (status != B_OK)
         return Fail(ProblemOf(signature, status));
     if (output.IsJson()) {

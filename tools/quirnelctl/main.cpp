@@ -31,6 +31,12 @@ constexpr char kUsage[] =
     "  reindex [VOLUME-ROOT...]            rebuild a volume's index from the attributes on its files\n"
     "  send [--launch] WHAT [--to SIGNATURE]\n"
     "                                      post a message code, such as 103 or 'ABCD', to a running program\n"
+    "  layer play FILE                     play FILE together with what plays already; Ctrl+C ends it\n"
+    "  layer list                          what plays: number, state, position, length, pitch, volume, name\n"
+    "  layer pitch NUMBER PITCH            1 is the track's own, 2 twice as fast and high; 0 halts\n"
+    "  layer seek NUMBER SECONDS           go on from there\n"
+    "  layer volume NUMBER VOLUME          from 0 to 1\n"
+    "  layer stop NUMBER                   end it\n"
     "\n"
     "  --json       one JSON object a line        --fields     a table of the songs' fields instead of "
     "paths\n"
@@ -54,7 +60,7 @@ struct Command {
     bool searches;
 };
 
-constexpr std::array<Command, 9> kCommands = {{
+constexpr std::array<Command, 10> kCommands = {{
     {"volumes", ListVolumes, false, false, false},
     {"index", IndexVolumes, true, true, false},
     {"strip", StripVolumes, false, false, false},
@@ -64,6 +70,7 @@ constexpr std::array<Command, 9> kCommands = {{
     {"cover", SetCover, true, true, false},
     {"reindex", ReindexVolumes, true, true, false},
     {"send", SendCode, false, false, false},
+    {"layer", ControlLayer, false, false, false},
 }};
 
 /// An empty text, or what is wrong with the command line.
