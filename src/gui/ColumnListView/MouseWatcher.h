@@ -8,9 +8,8 @@ class BView;
 // What the watchers send to the view. All carry "where" (BPoint, in the view's coordinates), "buttons" and
 // "modifiers" (int32, as GetMouse() and modifiers() have them).
 enum : uint32 {
-    // From StartMouseWatcher(): other buttons than at the start; the same buttons, away from where it
-    // started,
-    // every 50 ms as long as it stays away; no button, which is the last message.
+    // From StartMouseWatcher(): other buttons than at the start; the same, away from where it started, every
+    // 50 ms as long as it stays away; no button, which is the last message.
     MW_MOUSE_DOWN = 'Mw-D',
     MW_MOUSE_MOVED = 'Mw-M',
     MW_MOUSE_UP = 'Mw-U',
