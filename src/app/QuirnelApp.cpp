@@ -3,6 +3,8 @@
 #include "app/AppMessages.h"
 #include "indexing/FileIndexWindow.h"
 #include "indexing/UnattendedJobs.h"
+#include "playlist/PlayListWindow.h"
+#include "search/FindWindow.h"
 #include "soundplay/SoundplayScripter.h"
 
 #include <Alert.h>
@@ -91,18 +93,12 @@ void QuirnelApp::OpenIndexWindow(BMessage* settings) {
     new FileIndexWindow(settings);
 }
 
-// The find window and the playlist window have their slots, codes and settings; the windows themselves are
-// not there. The first wish for each is answered by a line on standard output.
-void QuirnelApp::OpenFindWindow(BMessage*) {
-    if (!mToldOfFindWindow)
-        printf("The find window is not there yet\n");
-    mToldOfFindWindow = true;
+void QuirnelApp::OpenFindWindow(BMessage* settings) {
+    new FindWindow(settings);
 }
 
-void QuirnelApp::OpenPlayListWindow(BMessage*) {
-    if (!mToldOfPlayListWindow)
-        printf("The playlist window is not there yet\n");
-    mToldOfPlayListWindow = true;
+void QuirnelApp::OpenPlayListWindow(BMessage* settings) {
+    new PlayListWindow(settings);
 }
 
 bool QuirnelApp::QuitRequested() {

@@ -100,8 +100,6 @@ class QuirnelApp : public BApplication {
     WindowSlot mFindWindow;
     WindowSlot mIndexWindow;
     std::unique_ptr<UnattendedJobs> mJobsWithoutWindow;
-    bool mToldOfFindWindow = false;
-    bool mToldOfPlayListWindow = false;
 };
 
 // Null before main() has made the application and after it was deleted.

@@ -2,6 +2,7 @@
 #include "app/QuirnelApp.h"
 
 #include "indexing/FileIndexWindow.h"
+#include "search/FindWindow.h"
 
 #include <Entry.h>
 #include <File.h>
@@ -85,9 +86,6 @@ void QuirnelApp::LoadPreferences(BMessage* settings) {
         OpenFindWindow(&window);
     if (mIndexWindow.IsEmpty() && mFindWindow.IsEmpty())
         OpenFindWindow(nullptr);
-    // There is no find window yet: the program must not run without any.
-    if (mIndexWindow.IsEmpty() && mFindWindow.IsEmpty())
-        OpenIndexWindow(nullptr);
 }
 
 void QuirnelApp::SavePreferences(BFile* file) {
@@ -113,7 +111,11 @@ void QuirnelApp::SavePreferences(BFile* file) {
 void QuirnelApp::SavePreferences(BMessage* settings) {
     if (settings == nullptr)
         return;
-    // The find window's frame comes first, once there is such a window.
+    mFindWindow.UseLocked([&](BWindow* window) {
+        BMessage frame;
+        static_cast<FindWindow*>(window)->SavePreferences(&frame);
+        settings->AddMessage(kFindWindow, &frame);
+    });
     mIndexWindow.UseLocked([&](BWindow* window) {
         BMessage frame;
         static_cast<FileIndexWindow*>(window)->SavePreferences(&frame);

@@ -44,7 +44,7 @@ class QuirnelAppSettings : public TrackTest {
         std::filesystem::remove_all(Path());
     }
     ~QuirnelAppSettings() override {
-        mApp->IndexWindowSlot().Close();
+        CloseWindows();
         std::filesystem::remove_all(Path());
         mApp.reset();
         brindle_app = nullptr;
@@ -52,6 +52,12 @@ class QuirnelAppSettings : public TrackTest {
 
     std::string Path() const { return mDirectory + "/Quirnel settings"; }
     bool HasIndexWindow() const { return !mApp->IndexWindowSlot().IsEmpty(); }
+    bool HasFindWindow() const { return !mApp->FindWindowSlot().IsEmpty(); }
+    void CloseWindows() {
+        mApp->IndexWindowSlot().Close();
+        mApp->FindWindowSlot().Close();
+        mApp->PlayListWindowSlot().Close();
+    }
 
     bool LoadFromSettingsFile() { return mApp->LoadPreferences(static_cast<BFile*>(nullptr)); }
     void SaveToSettingsFile() { mApp->SavePreferences(static_cast<BFile*>(nullptr)); }
@@ -248,33 +254,72 @@ TEST_F(QuirnelAppSettings, NoMessageIsFilledForNull) {
     mApp->SavePreferences(static_cast<BMessage*>(nullptr));
 }
 
-// Present behaviour: as the find window is not there yet, the indexer opens in its place.
-TEST_F(QuirnelAppSettings, SettingsThatNameNoWindowLeaveAUsableProgram) {
+TEST_F(QuirnelAppSettings, SettingsThatNameNoWindowOpenTheFindWindowAlone) {
     Write(Path(), BMessage());
     CapturedOutput output;
     EXPECT_TRUE(LoadFromSettingsFile());
-    EXPECT_EQ(output.text(), "The find window is not there yet\n");
-    EXPECT_TRUE(HasIndexWindow());
+    EXPECT_EQ(output.text(), "");
+    EXPECT_FALSE(HasIndexWindow());
+    ASSERT_TRUE(HasFindWindow());
+    mApp->FindWindowSlot().UseLocked(
+        [](BWindow* window) { EXPECT_EQ(window->Frame(), BRect(300, 30, 750, 230)); });
 }
 
-TEST_F(QuirnelAppSettings, SettingsThatNameTheFindWindowAloneLeaveAUsableProgram) {
+TEST_F(QuirnelAppSettings, TheWindowsThatAreNamedAreOpened) {
+    const struct { bool index, find; } cases[] = {{true, false}, {false, true}, {true, true}};
+    for (const auto& named : cases) {
+        BMessage settings;
+        BMessage frame = Frame(10, 20, 300, 200);
+        if (named.find)
+            settings.AddMessage("findwindow", &frame);
+        if (named.index)
+            settings.AddMessage("indexwindow", &frame);
+        mApp->LoadPreferences(&settings);
+        EXPECT_EQ(HasIndexWindow(), named.index);
+        EXPECT_EQ(HasFindWindow(), named.find);
+        EXPECT_TRUE(mApp->PlayListWindowSlot().IsEmpty());
+        CloseWindows();
+    }
+}
+
+TEST_F(QuirnelAppSettings, TheFindWindowIsSavedBeforeTheIndexerAndThePlaylistNever) {
     BMessage settings;
     BMessage frame = Frame(10, 20, 300, 200);
+    settings.AddMessage("indexwindow", &frame);
     settings.AddMessage("findwindow", &frame);
-    CapturedOutput output;
     mApp->LoadPreferences(&settings);
-    EXPECT_EQ(output.text(), "The find window is not there yet\n");
-    EXPECT_TRUE(HasIndexWindow());
+    BMessage open(103);
+    mApp->MessageReceived(&open);
+    ASSERT_FALSE(mApp->PlayListWindowSlot().IsEmpty());
+
+    BMessage saved;
+    mApp->SavePreferences(&saved);
+    ASSERT_EQ(saved.CountNames(B_ANY_TYPE), 2);
+    const char* const names[] = {"findwindow", "indexwindow"};
+    for (int32 i = 0; i < 2; ++i) {
+        char* name = nullptr;
+        type_code type = 0;
+        ASSERT_EQ(saved.GetInfo(B_ANY_TYPE, i, &name, &type), B_OK);
+        EXPECT_STREQ(name, names[i]);
+        BMessage window;
+        ASSERT_EQ(saved.FindMessage(names[i], &window), B_OK);
+        EXPECT_EQ(window.CountNames(B_FLOAT_TYPE), 4);
+    }
+
+    mApp->FindWindowSlot().Close();
+    BMessage later;
+    mApp->SavePreferences(&later);
+    EXPECT_FALSE(later.HasMessage("findwindow"));
+    EXPECT_TRUE(later.HasMessage("indexwindow"));
 }
 
 TEST_F(QuirnelAppSettings, FieldsOfOtherTypesNameNoWindow) {
     BMessage settings;
     settings.AddString("indexwindow", "open");
     settings.AddInt32("findwindow", 1);
-    CapturedOutput output;
     mApp->LoadPreferences(&settings);
-    EXPECT_EQ(output.text(), "The find window is not there yet\n");
-    EXPECT_TRUE(HasIndexWindow());
+    EXPECT_FALSE(HasIndexWindow());
+    EXPECT_TRUE(HasFindWindow());
 }
 
 TEST_F(QuirnelAppSettings, WhatIsNoMessageCountsAsOneThatNamesNoWindow) {
@@ -294,9 +339,10 @@ TEST_F(QuirnelAppSettings, WhatIsNoMessageCountsAsOneThatNamesNoWindow) {
         test::write_file(Path(), content);
         CapturedOutput output;
         EXPECT_TRUE(LoadFromSettingsFile()) << content.size();
-        EXPECT_EQ(output.text(), content == contents[0] ? "The find window is not there yet\n" : "");
-        EXPECT_TRUE(HasIndexWindow());
-        mApp->IndexWindowSlot().Close();
+        EXPECT_EQ(output.text(), "");
+        EXPECT_FALSE(HasIndexWindow()) << content.size();
+        EXPECT_TRUE(HasFindWindow()) << content.size();
+        CloseWindows();
     }
 }
 
@@ -309,7 +355,7 @@ TEST_F(QuirnelAppSettings, AHugeFileTakesNeitherTimeNorMemory) {
     // The first window of the process has its price.
     Write(Path(), BMessage());
     EXPECT_TRUE(LoadFromSettingsFile());
-    mApp->IndexWindowSlot().Close();
+    CloseWindows();
     constexpr char kHead[] = {'B', 'K', 'M', 1, 0, 0, 0x40, 6, 0, 0, 0, 0, 1, 0, 0, 0};
     for (const std::string& head : {std::string(), std::string(kHead, sizeof(kHead))}) {
         test::write_file(Path(), head);
@@ -317,8 +363,8 @@ TEST_F(QuirnelAppSettings, AHugeFileTakesNeitherTimeNorMemory) {
         const long before = peak();
         EXPECT_TRUE(LoadFromSettingsFile());
         EXPECT_LT(peak() - before, 20 * 1024) << "kilobytes";
-        EXPECT_TRUE(HasIndexWindow());
-        mApp->IndexWindowSlot().Close();
+        EXPECT_TRUE(HasFindWindow());
+        CloseWindows();
     }
 }
 
