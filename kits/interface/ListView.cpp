@@ -3,6 +3,7 @@
 #include "ControlLook.h"
 #include "ListAutoscroll.h"
 #include "RowPositions.h"
+#include "ViewHost.h"
 
 #include <Looper.h>
 #include <Message.h>
@@ -126,8 +127,17 @@ void BListView::MakeFocus(bool focus) {
 }
 
 void BListView::SetFont(const BFont* font, uint32 mask) {
+    BFont before;
+    GetFont(&before);
     BView::SetFont(font, mask);
-    UpdateAllRows();
+    BFont after;
+    GetFont(&after);
+    // A row that sets a font while the window is drawn anew does so for itself. To have all rows drawn again
+    // for that would never end.
+    const bool isDrawing = Host() != nullptr && Host()->DrawingLimit() != nullptr;
+    if (!isDrawing && !(after == before)) {
+        UpdateAllRows();
+    }
 }
 
 void BListView::ScrollTo(BPoint where) {

@@ -60,7 +60,8 @@ class BListView : public BView, public BInvoker {
     void MouseMoved(BPoint where, uint32 code, const BMessage* dragMessage) override;
     void MouseUp(BPoint where) override;
     void KeyDown(const char* bytes, int32 numBytes) override;
-    // Every row learns of it and may change its size.
+    // Every row learns of it and may change its size; but not of a font that is set while the window is drawn
+    // anew, which is one row's own.
     void SetFont(const BFont* font, uint32 mask = B_FONT_ALL) override;
     void ScrollTo(float x, float y) { ScrollTo(BPoint(x, y)); }
     void ScrollTo(BPoint where) override;
