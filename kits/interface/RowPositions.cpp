@@ -57,6 +57,10 @@ void RowPositions::Insert(int32 row, const std::vector<int32>& heights) {
         Append(heights);
         return;
     }
+    if (heights.size() >= kSmallPair) {
+        InsertBlocks(row, heights);
+        return;
+    }
     for (const int32 height : heights) {
         const size_t index = BlockOf(row);
         Block& block = mBlocks[index];
@@ -68,6 +72,25 @@ void RowPositions::Insert(int32 row, const std::vector<int32>& heights) {
         PlaceBlocksFrom(index);
         SplitWhenFull(index);
     }
+}
+
+// Many at once: in blocks of their own, so that what is behind moves once.
+void RowPositions::InsertBlocks(int32 row, const std::vector<int32>& heights) {
+    size_t index = BlockOf(row);
+    if (const int32 offset = row - mBlocks[index].firstRow; offset > 0) {
+        Split(index, static_cast<size_t>(offset));
+        ++index;
+    }
+    RowPositions added;
+    added.Append(heights);
+    const auto place = mBlocks.begin() + static_cast<ptrdiff_t>(index);
+    mBlocks.insert(place, std::make_move_iterator(added.mBlocks.begin()),
+                   std::make_move_iterator(added.mBlocks.end()));
+    mCount += added.mCount;
+    mHeight += added.mHeight;
+    PlaceBlocksFrom(index);
+    MergeWhenSmall(index + added.mBlocks.size());
+    MergeWhenSmall(index);
 }
 
 void RowPositions::Append(const std::vector<int32>& heights) {
@@ -120,18 +143,22 @@ void RowPositions::Clear() {
 }
 
 void RowPositions::SplitWhenFull(size_t index) {
-    if (mBlocks[index].heights.size() < kFullBlock) {
-        return;
+    if (mBlocks[index].heights.size() >= kFullBlock) {
+        Split(index, kFullBlock / 2);
+        PlaceBlocksFrom(index);
     }
+}
+
+// Where the second one begins is the caller's to find out.
+void RowPositions::Split(size_t index, size_t offset) {
     Block& first = mBlocks[index];
-    const auto middle = first.heights.begin() + static_cast<ptrdiff_t>(kFullBlock / 2);
+    const auto middle = first.heights.begin() + static_cast<ptrdiff_t>(offset);
     Block second;
     second.heights.assign(middle, first.heights.end());
     second.height = Sum(middle, first.heights.end());
     first.heights.erase(middle, first.heights.end());
     first.height -= second.height;
     mBlocks.insert(mBlocks.begin() + static_cast<ptrdiff_t>(index) + 1, std::move(second));
-    PlaceBlocksFrom(index);
 }
 
 void RowPositions::MergeWhenSmall(size_t index) {

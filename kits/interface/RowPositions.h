@@ -34,7 +34,9 @@ class RowPositions {
 
     size_t BlockOf(int32 row) const;
     void Append(const std::vector<int32>& heights);
+    void InsertBlocks(int32 row, const std::vector<int32>& heights);
     void SplitWhenFull(size_t block);
+    void Split(size_t block, size_t offset);
     void MergeWhenSmall(size_t block);
     // Where this block and all behind it begin.
     void PlaceBlocksFrom(size_t block);
