@@ -177,6 +177,9 @@ class WindowListener {
     virtual void key(const KeyInput& input) = 0;
     // Text that an input method has finished.
     virtual void text_committed(const std::string& text) = 0;
+    // Text that an input method is working on, with its caret (bytes from its beginning), to be shown where
+    // it will be inserted; empty when there is none any more.
+    virtual void text_composed(const std::string& text, int caret) = 0;
     virtual void drag(const DragInput& input) = 0;
     // A drag that start_drag() began is over; `accepted` when somebody took the data.
     virtual void drag_ended(bool accepted) = 0;
@@ -282,7 +285,8 @@ class WindowPeer {
     virtual void maximize(bool maximized) = 0;
     // To the front and, unless it takes no focus, active.
     virtual void activate() = 0;
-    virtual void send_behind() = 0;
+    // Behind all other windows, or right behind that one, which comes to the front.
+    virtual void send_behind(const std::shared_ptr<WindowPeer>& other) = 0;
     // Has the listener hear a pulse every so many microseconds; 0 for none, which costs nothing.
     virtual void set_pulse(std::int64_t interval) = 0;
     // Above that window, as its dialogue. Null for none.
@@ -304,6 +308,10 @@ class WindowPeer {
     // The window disappears, its listener is let go. Everything else is without effect afterwards.
     virtual void close() = 0;
 };
+
+// The desktop's leave for this program to bring a window to the front, as it is handed to programs that the
+// user starts (xdg-activation, startup notification). For the next activate(); empty for none.
+void take_activation_token(const std::string& token);
 
 // The window is hidden at first. Without a display it is never seen and its listener is never called.
 std::shared_ptr<WindowPeer> make_window(const WindowOptions& options, Area content,

@@ -1,5 +1,6 @@
 #include "input_translation.h"
 
+#include <QInputMethodEvent>
 #include <QKeyEvent>
 
 #include <algorithm>
@@ -120,6 +121,20 @@ KeyInput to_key_input(const QKeyEvent& event) {
     }
     input.modifiers = input.pressed ? input.modifiers | own : input.modifiers & ~own;
     return input;
+}
+
+InputMethodText to_input_method_text(const QInputMethodEvent& event) {
+    InputMethodText text;
+    text.committed = event.commitString().toStdString();
+    const QString& composed = event.preeditString();
+    text.composed = composed.toStdString();
+    text.caret = static_cast<int>(text.composed.size());
+    for (const QInputMethodEvent::Attribute& attribute : event.attributes()) {
+        if (attribute.type == QInputMethodEvent::Cursor) {
+            text.caret = static_cast<int>(composed.left(attribute.start).toUtf8().size());
+        }
+    }
+    return text;
 }
 
 int ClickCounter::press(std::uint32_t button, PointerPosition on_screen, std::int64_t now,

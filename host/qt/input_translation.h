@@ -5,6 +5,7 @@
 
 #include <Qt>
 
+class QInputMethodEvent;
 class QKeyEvent;
 
 namespace host {
@@ -12,6 +13,14 @@ namespace host {
 std::uint32_t to_buttons(Qt::MouseButtons buttons);
 std::uint32_t to_modifiers(Qt::KeyboardModifiers modifiers);
 KeyInput to_key_input(const QKeyEvent& event);
+
+// What an input method says: text that is finished, and then text that it is working on, UTF-8.
+struct InputMethodText {
+    std::string committed;
+    std::string composed;
+    int caret = 0; // in `composed`, in bytes; its end unless the event says otherwise
+};
+InputMethodText to_input_method_text(const QInputMethodEvent& event);
 
 // Counts presses that follow each other quickly in one place.
 class ClickCounter {

@@ -70,6 +70,7 @@ class DeafListener : public WindowListener {
     void wheel(const WheelInput& /*input*/) override {}
     void key(const KeyInput& /*input*/) override {}
     void text_committed(const std::string& /*text*/) override {}
+    void text_composed(const std::string& /*text*/, int /*caret*/) override {}
     void drag(const DragInput& /*input*/) override {}
     void drag_ended(bool /*accepted*/) override {}
     void popups_dismissed() override {}
@@ -82,6 +83,9 @@ std::shared_ptr<WindowListener> deaf_listener() {
     return *listener;
 }
 
+// The one window that the program takes for the active one, whatever pop-ups the focus passes through.
+ScreenWindow* active_window = nullptr;
+
 } // namespace
 
 ScreenWindow::ScreenWindow(std::shared_ptr<WindowPicture> picture, std::shared_ptr<WindowListener> listener)
@@ -93,11 +97,15 @@ ScreenWindow::ScreenWindow(std::shared_ptr<WindowPicture> picture, std::shared_p
 
 ScreenWindow::~ScreenWindow() {
     PopupStack::instance().remove(this);
+    if (active_window == this) {
+        active_window = nullptr;
+    }
 }
 
 void ScreenWindow::apply_options(const WindowOptions& options) {
     options_ = options;
-    setTitle(QString::fromStdString(options.title));
+    // To Qt an empty title means the program's name.
+    setTitle(options.title.empty() ? QStringLiteral(" ") : QString::fromStdString(options.title));
     if (const Qt::WindowFlags wanted = to_flags(options); wanted != flags()) {
         setFlags(wanted);
     }
@@ -155,6 +163,31 @@ void ScreenWindow::leave() {
     listener_ = deaf_listener();
     disappear();
     deleteLater();
+}
+
+void ScreenWindow::set_active(bool active) {
+    if (active == active_) {
+        return;
+    }
+    if (active && active_window != nullptr) {
+        active_window->set_active(false);
+    }
+    active_window = active ? this : nullptr;
+    active_ = active;
+    listener_->activated(active);
+}
+
+void ScreenWindow::program_left() {
+    if (active_window != nullptr) {
+        active_window->set_active(false);
+    }
+}
+
+void ScreenWindow::take_activation_token(const std::string& token) {
+    // Read by Qt when it next activates a window; on X11 the request's time says the same.
+    if (QGuiApplication::platformName() == QLatin1String("wayland")) {
+        qputenv("XDG_ACTIVATION_TOKEN", QByteArray::fromStdString(token));
+    }
 }
 
 void ScreenWindow::set_minimized(bool minimized) {

@@ -39,6 +39,8 @@ class ScreenWindow : public QWindow {
     void screens_changed() { listener_->screens_changed(); }
     // Hides the window; it tells its listener nothing any more and deletes itself.
     void leave();
+    // For the next window that comes to the front.
+    static void take_activation_token(const std::string& token);
     bool is_popup() const { return options_.kind == WindowKind::popup; }
 
     WindowListener& listener() { return *listener_; }
@@ -69,7 +71,11 @@ class ScreenWindow : public QWindow {
     void mouse_event(QMouseEvent* event, PointerInput::Kind kind);
     void drag_event(QDropEvent* event, DragInput::Kind kind);
     void input_method_query(QEvent* event) const;
+    void end_composing();
     void state_changed(Qt::WindowStates state);
+    void set_active(bool active);
+    // The focus has left all of the program's windows.
+    static void program_left();
 
     const std::shared_ptr<WindowPicture> picture_;
     std::shared_ptr<WindowListener> listener_;
@@ -85,6 +91,7 @@ class ScreenWindow : public QWindow {
     bool told_anything_ = false;
     bool active_ = false;
     bool text_input_ = false;
+    bool composing_ = false;
     Area caret_;
     DragVisit drag_visit_;
 };

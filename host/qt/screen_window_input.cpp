@@ -89,9 +89,16 @@ bool ScreenWindow::event(QEvent* event) {
         input_method_query(event);
         return true;
     case QEvent::InputMethod: {
-        const auto* const input = static_cast<QInputMethodEvent*>(event);
-        if (!input->commitString().isEmpty()) {
-            listener_->text_committed(input->commitString().toStdString());
+        const InputMethodText text = to_input_method_text(*static_cast<QInputMethodEvent*>(event));
+        if (!text.committed.empty() || text.composed.empty()) {
+            end_composing();
+        }
+        if (!text.committed.empty()) {
+            listener_->text_committed(text.committed);
+        }
+        if (!text.composed.empty()) {
+            composing_ = true;
+            listener_->text_composed(text.composed, text.caret);
         }
         return true;
     }
@@ -123,9 +130,8 @@ bool ScreenWindow::event(QEvent* event) {
 }
 
 void ScreenWindow::focusInEvent(QFocusEvent* /*event*/) {
-    if (!active_ && !is_popup()) {
-        active_ = true;
-        listener_->activated(true);
+    if (!is_popup()) {
+        set_active(true);
     }
 }
 
@@ -140,9 +146,11 @@ void ScreenWindow::focusOutEvent(QFocusEvent* /*event*/) {
     if (!handed_back) {
         PopupStack::instance().dismiss();
     }
-    if (active_) {
-        active_ = false;
-        listener_->activated(false);
+    if (next == nullptr) {
+        program_left();
+    } else {
+        // Of a pop-up that goes, the window that gets the focus tells the one that was active.
+        set_active(false);
     }
 }
 
@@ -236,6 +244,13 @@ void ScreenWindow::input_method_query(QEvent* event) const {
         query->setValue(Qt::ImHints, static_cast<int>(Qt::ImhNone));
     }
     query->accept();
+}
+
+void ScreenWindow::end_composing() {
+    if (composing_) {
+        composing_ = false;
+        listener_->text_composed({}, 0);
+    }
 }
 
 void ScreenWindow::drag_event(QDropEvent* event, DragInput::Kind kind) {

@@ -39,8 +39,18 @@ class QtWindowPeer : public WindowPeer {
     void activate() override {
         ask([](ScreenWindow& window) { window.come_to_front(); });
     }
-    void send_behind() override {
-        ask([](ScreenWindow& window) { window.lower(); });
+    void send_behind(const std::shared_ptr<WindowPeer>& other) override {
+        const auto* const peer = dynamic_cast<const QtWindowPeer*>(other.get());
+        const std::shared_ptr<Shared> above = peer != nullptr ? peer->shared_ : nullptr;
+        ask([above](ScreenWindow& window) {
+            if (above == nullptr || above->window == nullptr) {
+                window.lower();
+                return;
+            }
+            // Window managers are asked for the front or the back, never for a place between.
+            window.raise();
+            above->window->raise();
+        });
     }
     void set_pulse(std::int64_t interval) override {
         ask([interval](ScreenWindow& window) { window.set_pulse(interval); });
@@ -115,6 +125,12 @@ class QtWindowPeer : public WindowPeer {
 };
 
 } // namespace
+
+void take_activation_token(const std::string& token) {
+    if (!token.empty()) {
+        MainThread::instance().add([token] { ScreenWindow::take_activation_token(token); });
+    }
+}
 
 std::shared_ptr<WindowPeer> make_window(const WindowOptions& options, Area content,
                                         std::shared_ptr<WindowListener> listener) {

@@ -172,7 +172,16 @@ void BApplication::Quit() {
 }
 
 bool BApplication::QuitRequested() {
-    return BLooper::QuitRequested();
+    if (sMainLoop == nullptr)
+        return BLooper::QuitRequested();
+    // A window that is asked may want to lock the application.
+    const int32 locks = IsLocked() ? CountLocks() : 0;
+    for (int32 i = 0; i < locks; ++i)
+        Unlock();
+    const bool closed = sMainLoop->CloseWindows();
+    for (int32 i = 0; i < locks; ++i)
+        Lock();
+    return closed;
 }
 
 void BApplication::ReadyToRun() {}

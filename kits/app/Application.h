@@ -37,6 +37,9 @@ class BApplication : public BLooper {
     thread_id Run() override;
     // Ends Run(), in any thread.
     void Quit() override;
+    // Asks the windows, the last made first: each one that agrees (BWindow::QuitRequested()) is closed; one
+    // that refuses keeps itself, the others that are left, and the application. Meanwhile the application is
+    // not locked.
     bool QuitRequested() override;
 
     // Hooks, called in the application's thread.

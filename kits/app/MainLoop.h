@@ -18,6 +18,9 @@ class MainLoop {
     virtual bool Run() = 0;
     // Called once, from the application's looper thread, as it ends.
     virtual void Quit() = 0;
+    // Asks the program's windows whether they may go, and closes each one that agrees, the last made first.
+    // False, and the others stay, as soon as one refuses. Called without the application locked.
+    [[nodiscard]] virtual bool CloseWindows() { return true; }
     // Brings the program's windows to the front, because the user started the program again or another one
     // asks for it. `token` is what the desktop gave for this (its activation token or start-up id), empty for
     // none. Called from the application's looper thread; returns at once.

@@ -9,6 +9,7 @@
 #include <Invoker.h>
 #include <MessageQueue.h>
 #include <Screen.h>
+#include <TextView.h>
 #include <ThreadSafety.h>
 
 #include <algorithm>
@@ -36,6 +37,14 @@ constexpr bigtime_t kUpdateInterval = 25000;
 
 bool IsAskedToQuit(const BLooper& looper) {
     return looper.MessageQueue()->FindMessage(B_QUIT_REQUESTED) != nullptr;
+}
+
+std::string Joined(const std::vector<std::string>& lines) {
+    std::string text;
+    for (const std::string& line : lines) {
+        text += (&line == &lines.front() ? "" : "\n") + line;
+    }
+    return text;
 }
 
 } // namespace
@@ -176,7 +185,17 @@ void BAlert::Build() {
         mButtons[i] = button;
     }
     const AlertLayout layout = lay_out_alert(contents);
-    auto* const view = new AlertView(layout, mParts.type, std::move(lines));
+    auto* const view = new AlertView(layout, mParts.type);
+    // The lines are broken already.
+    BRect textRect = layout.text.OffsetToCopy(B_ORIGIN);
+    mTextView = new BTextView(layout.text, "_tv_", textRect, B_FOLLOW_ALL, B_WILL_DRAW);
+    mTextView->SetWordWrap(false);
+    mTextView->SetText(Joined(lines).c_str());
+    mTextView->MakeEditable(false);
+    mTextView->MakeSelectable(false);
+    mTextView->SetViewColor(ControlLook::kPanel);
+    mTextView->SetLowColor(ControlLook::kPanel);
+    view->AddChild(mTextView);
     for (size_t i = 0; i < mParts.labels.size(); ++i) {
         mButtons[i]->MoveTo(layout.buttons[i].LeftTop());
         mButtons[i]->ResizeTo(layout.buttons[i].Width(), layout.buttons[i].Height());

@@ -11,6 +11,7 @@
 class AlertAnswer;
 class BButton;
 class BInvoker;
+class BTextView;
 
 enum alert_type { B_EMPTY_ALERT = 0, B_INFO_ALERT, B_IDEA_ALERT, B_WARNING_ALERT, B_STOP_ALERT };
 
@@ -55,6 +56,9 @@ class BAlert : public BWindow {
 
     // Null for a number of no button.
     BButton* ButtonAt(int32 index) const;
+    // Shows the text; for changing its looks before Go(). The alert keeps the size that its first text asked
+    // for.
+    BTextView* TextView() const { return mTextView; }
 
     void MessageReceived(BMessage* message) override;
     void DispatchMessage(BMessage* message, BHandler* handler) override;
@@ -83,6 +87,7 @@ class BAlert : public BWindow {
     Parts mParts;
     // The window's.
     std::array<BButton*, kMaxButtons> mButtons = {};
+    BTextView* mTextView = nullptr;
     std::array<char, kMaxButtons> mShortcuts = {};
     std::shared_ptr<AlertAnswer> mAnswer;
     BInvoker* mInvoker = nullptr;

@@ -1,4 +1,4 @@
-// AlertView: what of an alert is no button.
+// AlertView: what of an alert is neither text nor button.
 #pragma once
 
 #include "AlertLayout.h"
@@ -7,21 +7,18 @@
 #include <View.h>
 
 #include <memory>
-#include <string>
-#include <vector>
 
 class BBitmap;
 
-// Fills the alert. Draws the stripe, the icon and the lines of the text.
+// Fills the alert. Draws the stripe and the icon.
 class AlertView : public BView {
   public:
-    AlertView(const AlertLayout& layout, alert_type type, std::vector<std::string> lines);
+    AlertView(const AlertLayout& layout, alert_type type);
     ~AlertView() override;
 
     void Draw(BRect updateRect) override;
 
   private:
     const AlertLayout mLayout;
-    const std::vector<std::string> mLines;
     const std::unique_ptr<BBitmap> mIcon;
 };

@@ -119,6 +119,10 @@ inline constexpr uint32 B_FRAME_EVENTS = 0x04000000U;
 inline constexpr uint32 B_NAVIGABLE = 0x02000000U;
 inline constexpr uint32 B_SUBPIXEL_PRECISE = 0x01000000U;
 inline constexpr uint32 B_DRAW_ON_CHILDREN = 0x00800000U;
+// "be:opcode" of a B_INPUT_METHOD_EVENT, which goes to the focus view: with B_INPUT_METHOD_CHANGED, the text
+// that an input method is working on is "be:string", empty when there is none any more, and its caret stands
+// at byte "be:selection" (int32). What is finished comes as keys.
+inline constexpr int32 B_INPUT_METHOD_CHANGED = 2;
 inline constexpr uint32 B_INPUT_METHOD_AWARE = 0x00400000U;
 
 // Resizing modes: for each edge of a view, the edge of its parent that it keeps its distance to. Four

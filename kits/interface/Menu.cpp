@@ -2,9 +2,13 @@
 
 #include "LooperHold.h"
 #include "MenuLayout.h"
+#include "MenuPlacement.h"
+#include "MenuWindow.h"
 
 #include <MenuBar.h>
 #include <MenuItem.h>
+
+#include <algorithm>
 
 namespace {
 
@@ -48,7 +52,9 @@ BMenu::BMenu(BMessage* archive) : BView(archive) {
     }
 }
 
-BMenu::~BMenu() = default;
+BMenu::~BMenu() {
+    mShownAlone.reset();
+}
 
 void BMenu::Initialise() {
     mMargins = std::make_unique<MenuMargins>(kUsualMargins);
@@ -166,6 +172,8 @@ void BMenu::SetRadioMode(bool radioMode) {
     mRadioMode = radioMode;
     if (!radioMode) {
         mLabelFromMarked = false;
+    } else if (BMenuItem* const marked = FindMarked(); marked != nullptr) {
+        ItemMarked(marked);
     }
 }
 
@@ -219,10 +227,51 @@ bool BMenu::AddDynamicItem(add_state /*state*/) {
     return false;
 }
 
-void BMenu::AddDynamicItems() {
+bool BMenu::AddDynamicItems(const std::function<bool()>& userLeaves) {
     for (bool more = AddDynamicItem(B_INITIAL_ADD); more;) {
+        if (userLeaves()) {
+            AddDynamicItem(B_ABORT);
+            return false;
+        }
         more = AddDynamicItem(B_PROCESSING);
     }
+    return true;
+}
+
+void BMenu::Show() {
+    Show(false);
+}
+
+void BMenu::Show(bool selectFirst) {
+    if (Host() != nullptr) {
+        BView::Show();
+        return;
+    }
+    (void)AddDynamicItems([] { return false; });
+    LayoutItems();
+    auto shown = std::make_unique<MenuWindows>(std::make_shared<MenuEvents>());
+    const BPoint where = ScreenLocation();
+    const MenuPane pane(pop_up_frame(where, MenuPane::OuterSide(mContentSize.x),
+                                     MenuPane::OuterSide(mContentSize.y), shown->Screen(where)),
+                        mContentSize.y);
+    if (CountItems() == 0 || !shown->Show(this, pane)) {
+        return;
+    }
+    mShownAlone = std::move(shown);
+    const auto first =
+        std::find_if(mItems.begin(), mItems.end(), [](const auto& item) { return item->IsEnabled(); });
+    if (selectFirst && first != mItems.end()) {
+        SelectItem(first->get());
+    }
+}
+
+void BMenu::Hide() {
+    if (mShownAlone == nullptr) {
+        BView::Hide();
+        return;
+    }
+    SelectItem(nullptr);
+    mShownAlone.reset();
 }
 
 BPoint BMenu::ScreenLocation() {

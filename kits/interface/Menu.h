@@ -5,6 +5,7 @@
 #include <List.h>
 #include <View.h>
 
+#include <functional>
 #include <memory>
 #include <vector>
 
@@ -12,6 +13,7 @@ class BMenu;
 class BMenuBar;
 class BMenuItem;
 class BMessenger;
+class MenuWindows;
 struct MenuItemExtent;
 struct MenuMargins;
 
@@ -95,7 +97,7 @@ class BMenu : public BView {
     virtual status_t SetTargetForItems(BHandler* target);
     virtual status_t SetTargetForItems(BMessenger target);
     virtual void SetEnabled(bool enabled);
-    // At most one item is marked, and choosing one marks it.
+    // At most one item is marked, the first one of those that are, and choosing one marks it.
     virtual void SetRadioMode(bool radioMode);
     virtual void SetTriggersEnabled(bool enabled);
     // Labels are cut to this width; 0, as at first, for no limit.
@@ -128,8 +130,9 @@ class BMenu : public BView {
     void SetTrackingHook(menu_tracking_hook hook, void* state);
 
     // For menus whose items are found out when they open. Called with B_INITIAL_ADD, then, as long as the
-    // answer is true, with B_PROCESSING. The menu opens after that, so nobody can leave it before the end and
-    // B_ABORT is not sent yet.
+    // answer is true, with B_PROCESSING; the menu opens after that. When the user goes away from the item
+    // that it hangs from, or leaves menus, it is called once more with B_ABORT, and the menu does not open.
+    // The bar's window is locked meanwhile.
     enum add_state { B_INITIAL_ADD, B_PROCESSING, B_ABORT };
     virtual bool AddDynamicItem(add_state state);
 
@@ -144,6 +147,12 @@ class BMenu : public BView {
     // With `startOpened` it stays open when the mouse button is released inside `clickToOpen` (screen
     // coordinates) or, without one, where it was opened.
     BMenuItem* Track(bool startOpened = false, BRect* clickToOpen = nullptr);
+    // Opens the menu at ScreenLocation(), for the owner to close again: nobody follows the pointer or the
+    // keys, which the open menu keeps from all other windows. Without effect when it has no items, or without
+    // a display. In a menu that lies in a window already, they show and hide it like any view.
+    void Show() override;
+    void Show(bool selectFirst);
+    void Hide() override;
     // Where the left top corner of the menu is wanted, in screen coordinates. The menu is moved from there as
     // far as it takes to lie on the screen.
     virtual BPoint ScreenLocation();
@@ -172,8 +181,8 @@ class BMenu : public BView {
     void ShowTriggers(bool show);
     // By the frames of the last layout.
     BMenuItem* ItemUnder(BPoint where) const;
-    // Calls AddDynamicItem() until it is done.
-    void AddDynamicItems();
+    // Calls AddDynamicItem() until it is done. False when it was not, as the user has left.
+    bool AddDynamicItems(const std::function<bool()>& userLeaves);
     // The items and those below them now belong to a menu bar in this window, or no longer.
     void Install(BMenuBar* bar);
     void Uninstall();
@@ -201,4 +210,6 @@ class BMenu : public BView {
     BPoint mUsualLocation;
     menu_tracking_hook mTrackingHook = nullptr;
     void* mTrackingState = nullptr;
+    // Between Show() and Hide().
+    std::unique_ptr<MenuWindows> mShownAlone;
 };

@@ -57,6 +57,7 @@ class BMenuBar : public BMenu, public KeyMenuTarget {
   private:
     friend class BMenu;
     friend class BMenuItem;
+    friend class BMenuField;
     class InputFilter;
 
     // Begins it with the title selected, or null for none; see MenuTracker for the ways.

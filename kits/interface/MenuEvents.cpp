@@ -16,6 +16,11 @@ void MenuEvents::Post(MenuEvent event) {
     mArrived.notify_one();
 }
 
+bool MenuEvents::Any(const std::function<bool(const MenuEvent&)>& isSo) {
+    GuardLock guard(mMutex);
+    return std::any_of(mEvents.begin(), mEvents.end(), isSo);
+}
+
 std::optional<MenuEvent> MenuEvents::Wait(bigtime_t until) {
     constexpr bigtime_t kForEver = bigtime_t{100} * 365 * 24 * 3600 * 1000000;
     const bigtime_t left =

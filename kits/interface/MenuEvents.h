@@ -6,11 +6,12 @@
 #include <ThreadSafety.h>
 
 #include <deque>
+#include <functional>
 #include <optional>
 #include <string>
 
 struct MenuEvent {
-    enum class Kind { Moved, Pressed, Released, Wheel, Key, Dismissed };
+    enum class Kind { Moved, Pressed, Released, Wheel, Key, LayoutChanged, Dismissed };
     Kind kind = Kind::Dismissed;
     BPoint where; // on the screen
     float lines = 0;
@@ -25,6 +26,8 @@ class MenuEvents {
     // The oldest event; of moves that follow each other the last one. None when `until` (system_time()) has
     // come before one.
     std::optional<MenuEvent> Wait(bigtime_t until);
+    // Whether one of those that wait is so; they go on waiting.
+    bool Any(const std::function<bool(const MenuEvent&)>& isSo);
 
   private:
     GuardMutex mMutex;

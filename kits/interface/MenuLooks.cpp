@@ -5,6 +5,7 @@
 #include "LooperHold.h"
 #include "MenuLayout.h"
 #include "MenuTriggers.h"
+#include "MenuWindow.h"
 
 #include <MenuItem.h>
 
@@ -31,6 +32,9 @@ void BMenu::InvalidateLayout() {
     if (Host() != nullptr) {
         LayoutItems();
         Invalidate();
+        if (auto* const window = dynamic_cast<MenuWindow*>(Window()); window != nullptr) {
+            window->MenuChanged();
+        }
     }
 }
 

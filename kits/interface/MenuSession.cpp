@@ -40,6 +40,9 @@ void MenuSession::Handle(const std::optional<MenuEvent>& event) {
         case MenuEvent::Kind::Key:
             mTracker.KeyPressed(event->bytes);
             break;
+        case MenuEvent::Kind::LayoutChanged:
+            mTracker.LayOutAgain();
+            break;
         case MenuEvent::Kind::Dismissed:
             mTracker.Cancel();
             break;

@@ -33,7 +33,7 @@ MenuTracker::~MenuTracker() {
 
 void MenuTracker::BeginOnPressedTitle(BRect frame, BMenuItem* title, BPoint where, bigtime_t when) {
     mRoot->LayoutItems();
-    mLevels.push_back({mRoot, MenuPane(frame, frame.Height(), MenuPane::Border::None), true});
+    mLevels.push_back({mRoot, MenuPane(frame, frame.Height(), MenuPane::Border::None), true, BPoint()});
     mPointer = where;
     mPressedAt = where;
     mButtonDown = true;
@@ -44,7 +44,7 @@ void MenuTracker::BeginOnPressedTitle(BRect frame, BMenuItem* title, BPoint wher
 
 void MenuTracker::BeginOnTitleByKey(BRect frame, BMenuItem* title, TitleMenu menu) {
     mRoot->LayoutItems();
-    mLevels.push_back({mRoot, MenuPane(frame, frame.Height(), MenuPane::Border::None), true});
+    mLevels.push_back({mRoot, MenuPane(frame, frame.Height(), MenuPane::Border::None), true, BPoint()});
     ShowTriggers();
     Select(0, title);
     if (menu == TitleMenu::Opens) {
@@ -54,7 +54,8 @@ void MenuTracker::BeginOnTitleByKey(BRect frame, BMenuItem* title, TitleMenu men
 
 void MenuTracker::BeginPopUp(BPoint location, BPoint where, Button button, FirstRelease release,
                              bigtime_t /*when*/) {
-    mRoot->AddDynamicItems();
+    // Nothing is shown that the user could leave.
+    (void)mRoot->AddDynamicItems([] { return false; });
     mRoot->LayoutItems();
     mPointer = where;
     mPressedAt = where;
@@ -69,7 +70,7 @@ void MenuTracker::BeginPopUp(BPoint location, BPoint where, Button button, First
         mOutcome = Outcome::Cancelled;
         return;
     }
-    mLevels.push_back({mRoot, pane, false});
+    mLevels.push_back({mRoot, pane, false, mRoot->mContentSize});
     // The pointer is within the menu from the start, as a rule; it selects only once it moves.
 }
 
@@ -307,60 +308,6 @@ bool MenuTracker::IsAnythingShown() const {
 
 void MenuTracker::Select(size_t level, BMenuItem* item) {
     mLevels[level].menu->SelectItem(item);
-}
-
-bool MenuTracker::OpenSelected(size_t level) {
-    const Level& here = mLevels[level];
-    BMenuItem* const item = here.menu->mSelected;
-    BMenu* const submenu = item == nullptr ? nullptr : item->Submenu();
-    if (submenu == nullptr || !item->IsEnabled() || level != Deepest()) {
-        return false;
-    }
-    submenu->AddDynamicItems();
-    submenu->LayoutItems();
-    if (submenu->CountItems() == 0) {
-        return false;
-    }
-    const BRect frame = here.pane.ToScreen(item->Frame());
-    const BRect screen = mStage.Screen(frame.LeftTop());
-    const float width = MenuPane::OuterSide(submenu->mContentSize.x);
-    const float height = MenuPane::OuterSide(submenu->mContentSize.y);
-    const bool below = here.menu->Layout() == B_ITEMS_IN_ROW;
-    const BPoint usual(below ? frame.left : frame.right + 1,
-                       below ? frame.bottom + 1 : frame.top - MenuPane::kBorder);
-    submenu->mUsualLocation = usual;
-    const BPoint wanted = submenu->ScreenLocation();
-    BRect place;
-    if (wanted != usual) {
-        place = pop_up_frame(wanted, width, height, screen);
-    } else if (below) {
-        place = frame_below_item(frame, width, height, screen);
-    } else {
-        place = frame_beside_item(frame, width, height, MenuPane::kBorder, screen);
-    }
-    const MenuPane pane(place, submenu->mContentSize.y);
-    submenu->ShowTriggers(mTriggersShown);
-    if (!mStage.Show(submenu, pane)) {
-        return false;
-    }
-    mLevels.push_back({submenu, pane, false});
-    return true;
-}
-
-void MenuTracker::CloseBelow(size_t level) {
-    while (Deepest() > level) {
-        const Level closing = mLevels.back();
-        mLevels.pop_back();
-        closing.menu->SelectItem(nullptr);
-        mStage.Hide(closing.menu);
-    }
-}
-
-void MenuTracker::Scroll(size_t level, float distance) {
-    Level& here = mLevels[level];
-    if (here.pane.ScrollBy(distance)) {
-        mStage.Scrolled(here.menu, here.pane);
-    }
 }
 
 void MenuTracker::ForgetTimes() {

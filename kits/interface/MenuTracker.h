@@ -50,6 +50,8 @@ class MenuTracker {
     // The bytes of a key that was pressed. False when it means nothing in menus.
     bool KeyPressed(std::string_view bytes);
     void TimePassed(bigtime_t now);
+    // Open menus whose items have changed their size get the room that they need now.
+    void LayOutAgain();
     // B_INFINITE_TIMEOUT when there is nothing to wait for.
     bigtime_t NextTime() const;
     void Cancel();
@@ -68,6 +70,7 @@ class MenuTracker {
         BMenu* menu = nullptr;
         MenuPane pane;
         bool isBar = false;
+        BPoint contentSize;
     };
     static constexpr size_t kNowhere = static_cast<size_t>(-1);
 
@@ -82,6 +85,8 @@ class MenuTracker {
 
     void Select(size_t level, BMenuItem* item);
     bool OpenSelected(size_t level);
+    // False when the user has left meanwhile.
+    bool MakeUp(BMenu* menu, BRect item);
     void CloseBelow(size_t level);
     void Scroll(size_t level, float distance);
     void Finish(Outcome outcome, BMenuItem* chosen);

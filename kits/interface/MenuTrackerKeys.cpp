@@ -137,7 +137,7 @@ void MenuTracker::GoTo(BMenuItem* item) {
     Select(Deepest(), item);
     Level& here = mLevels.back();
     if (here.pane.Reveal(item->Frame())) {
-        mStage.Scrolled(here.menu, here.pane);
+        mStage.PaneChanged(here.menu, here.pane);
     }
 }
 

@@ -8,6 +8,16 @@
 #include <Screen.h>
 
 #include <algorithm>
+#include <string_view>
+
+namespace {
+
+BPoint LivePointer() {
+    const host::PointerPosition pointer = host::live_input().on_screen;
+    return {static_cast<float>(pointer.x), static_cast<float>(pointer.y)};
+}
+
+} // namespace
 
 MenuWindow::MenuWindow(BMenu* menu, const MenuPane& pane, std::shared_ptr<MenuEvents> events)
     : BWindow(pane.Frame(), menu->Name(), B_NO_BORDER_WINDOW_LOOK, kPopUpWindowFeel,
@@ -16,11 +26,22 @@ MenuWindow::MenuWindow(BMenu* menu, const MenuPane& pane, std::shared_ptr<MenuEv
     AddChild(mPaneView);
 }
 
-void MenuWindow::Scrolled(const MenuPane& pane) {
+void MenuWindow::PaneChanged(const MenuPane& pane) {
     if (Lock()) {
+        if (pane.Frame() != Frame()) {
+            MoveTo(pane.Frame().LeftTop());
+            ResizeTo(pane.Frame().Width(), pane.Frame().Height());
+            mPaneView->Invalidate();
+        }
         mPaneView->SetPane(pane);
         Unlock();
     }
+}
+
+void MenuWindow::MenuChanged() {
+    MenuEvent changed;
+    changed.kind = MenuEvent::Kind::LayoutChanged;
+    mEvents->Post(std::move(changed));
 }
 
 void MenuWindow::GiveMenuBack() {
@@ -133,12 +154,34 @@ bool MenuWindows::Show(BMenu* menu, const MenuPane& pane) {
     return true;
 }
 
-void MenuWindows::Scrolled(BMenu* menu, const MenuPane& pane) {
+void MenuWindows::PaneChanged(BMenu* menu, const MenuPane& pane) {
     for (const auto& [shown, window] : mShown) {
         if (shown == menu) {
-            window->Scrolled(pane);
+            window->PaneChanged(pane);
         }
     }
+}
+
+void MenuWindows::MakingUp(BRect item) {
+    mMadeUpItem = item;
+    mPointerBefore = LivePointer();
+}
+
+bool MenuWindows::UserLeaves() {
+    const BPoint pointer = LivePointer();
+    const bool wentAway = pointer != mPointerBefore && !mMadeUpItem.Contains(pointer);
+    return wentAway || mEvents->Any([this](const MenuEvent& event) {
+        switch (event.kind) {
+        case MenuEvent::Kind::Dismissed:
+            return true;
+        case MenuEvent::Kind::Key:
+            return event.bytes == std::string_view("\x1b");
+        case MenuEvent::Kind::Pressed:
+            return !mMadeUpItem.Contains(event.where);
+        default:
+            return false;
+        }
+    });
 }
 
 void MenuWindows::Hide(BMenu* menu) {

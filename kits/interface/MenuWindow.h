@@ -19,7 +19,9 @@ class MenuWindow : public BWindow {
     // The menu must belong to no window.
     MenuWindow(BMenu* menu, const MenuPane& pane, std::shared_ptr<MenuEvents> events);
 
-    void Scrolled(const MenuPane& pane);
+    void PaneChanged(const MenuPane& pane);
+    // The menu has measured its items anew: whoever follows it hears of that. In any thread.
+    void MenuChanged();
     // Gives the menu back and ends the window.
     void GiveMenuBack();
 
@@ -46,11 +48,15 @@ class MenuWindows : public MenuStage {
 
     BRect Screen(BPoint where) override;
     bool Show(BMenu* menu, const MenuPane& pane) override;
-    void Scrolled(BMenu* menu, const MenuPane& pane) override;
+    void PaneChanged(BMenu* menu, const MenuPane& pane) override;
     void Hide(BMenu* menu) override;
+    void MakingUp(BRect item) override;
+    bool UserLeaves() override;
 
   private:
     const std::shared_ptr<MenuEvents> mEvents;
     // The windows delete themselves once they have given back their menu.
     std::vector<std::pair<BMenu*, MenuWindow*>> mShown;
+    BRect mMadeUpItem;
+    BPoint mPointerBefore;
 };

@@ -63,6 +63,9 @@ BMenuItem* BPopUpMenu::Start(const Opening& opening, bool async) {
 
 BMenuItem* BPopUpMenu::Run(const Opening& opening) {
     BMenuItem* const chosen = MenuSession::RunPopUp(this, opening.wish);
+    if (chosen != nullptr && chosen->Menu()->IsRadioMode()) {
+        chosen->SetMarked(true);
+    }
     if (chosen != nullptr && opening.deliversMessage) {
         static_cast<BInvoker*>(chosen)->Invoke();
     }

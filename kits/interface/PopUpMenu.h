@@ -23,7 +23,7 @@ class BPopUpMenu : public BMenu {
     // meanwhile. Asynchronously it returns null at once, and a thread of the menu's own does the rest. Null,
     // too, when the menu is open already or there is no display.
     //
-    // With `deliversMessage` the chosen item is invoked.
+    // With `deliversMessage` the chosen item is invoked; in radio mode it is marked in any case.
     //
     // While a mouse button is held it chooses where it is let go, and another press is not needed. Let go
     // where it was pressed, inside `clickToOpen`, or anywhere with `openAnyway`, it leaves the menu open; let

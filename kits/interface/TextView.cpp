@@ -103,7 +103,9 @@ void BTextView::Initialise() {
 
 void BTextView::AttachedToWindow() {
     BView::AttachedToWindow();
-    SetViewCursor(B_CURSOR_I_BEAM);
+    if (mSelectable || mEditable) {
+        SetViewCursor(B_CURSOR_I_BEAM);
+    }
     LayOut();
 }
 
@@ -141,6 +143,7 @@ void BTextView::MakeFocus(bool focus) {
         return;
     }
     mHistory.EndRun();
+    EndComposition();
     ShowCaret();
     InvalidateText();
     if (mScrollView != nullptr) {

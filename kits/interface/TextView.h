@@ -25,7 +25,8 @@ enum undo_state { B_UNDO_UNAVAILABLE, B_UNDO_TYPING, B_UNDO_CUT, B_UNDO_PASTE, B
 // caret, with Shift they select; a double click selects a word, a triple one a line. Cut, copied, pasted and
 // undone is through the messages B_CUT, B_COPY, B_PASTE, B_SELECT_ALL, B_UNDO and B_REDO, which windows send
 // for the usual keys; Control-Y and Control-Shift-Z do again what was undone. Text that is dropped is
-// inserted. Thread rule: that of BView.
+// inserted. What an input method is working on is shown underlined at the caret and is no part of the text
+// yet. Thread rule: that of BView.
 class BTextView : public BView {
   public:
     // `textRect`, in the view's coordinates, says where the text begins and how wide wrapped lines are.
@@ -176,6 +177,14 @@ class BTextView : public BView {
     void FixupScrollBars();
     void CopyTo(BClipboard* clipboard) const;
 
+    // What an input method is working on.
+    void SetComposition(std::string text, int32 caret);
+    void EndComposition() { SetComposition({}, 0); }
+    float CompositionWidth(size_t bytes) const;
+    // Draws the line that the composition is on.
+    void DrawLineWithComposition(int32 line, float baseline);
+    void DrawPiece(int32 from, int32 end, float left, float baseline);
+
     bool HandleMovement(char byte, uint32 modifiers);
     bool HandleErasing(char byte, uint32 modifiers);
     bool HandleClipboardKeys(char byte, uint32 modifiers);
@@ -203,6 +212,8 @@ class BTextView : public BView {
     bool mSelectable = true;
     bool mUndoes = true;
     bool mHidden = false;
+    std::string mComposition;
+    size_t mCompositionCaret = 0; // bytes from its beginning
     bool mCaretShown = true;
     bigtime_t mCaretMoved = 0; // when it was last shown for sure
 };

@@ -123,7 +123,8 @@ void BTextView::GetTextRegion(int32 startOffset, int32 endOffset, BRegion* regio
 
 BRect BTextView::CaretRect() const {
     float height = 0;
-    const BPoint place = PointAt(mSelection.Caret(), &height);
+    BPoint place = PointAt(mSelection.Caret(), &height);
+    place.x += CompositionWidth(mCompositionCaret);
     const float x = std::max(Bounds().left, std::round(place.x) - (place.x > mTextRect.left ? 1.0F : 0.0F));
     return {x, place.y, x, place.y + height - 1};
 }
@@ -163,7 +164,7 @@ void BTextView::Draw(BRect updateRect) {
         DrawLine(line, ControlLook::Baseline(font, lineRect));
     }
     PopState();
-    if (ShowsFocus() && mEditable && mSelection.IsEmpty() && mCaretShown) {
+    if (ShowsFocus() && mEditable && (mSelection.IsEmpty() || !mComposition.empty()) && mCaretShown) {
         FillRect(CaretRect());
     }
 }
@@ -191,11 +192,19 @@ void BTextView::DrawSelection(int32 line, BRect lineRect) {
 void BTextView::DrawLine(int32 line, float baseline) {
     // Mixed with what is there: the page, or the selection.
     SetDrawingMode(B_OP_OVER);
-    const float left = mTextRect.left + IndentOf(line);
-    const int32 end = mLayout.EndOf(line);
+    if (!mComposition.empty() && line == CurrentLine()) {
+        DrawLineWithComposition(line, baseline);
+    } else {
+        DrawPiece(mLayout.StartOf(line), mLayout.EndOf(line), mTextRect.left + IndentOf(line), baseline);
+    }
+    SetDrawingMode(B_OP_COPY);
+}
+
+// `left` is where the line begins.
+void BTextView::DrawPiece(int32 from, int32 end, float left, float baseline) {
     // Tabs have their width from the layout; between them the text is drawn in one piece, so that letters
     // join as they were measured.
-    for (int32 start = mLayout.StartOf(line); start < end;) {
+    for (int32 start = from; start < end;) {
         const size_t tab = mHidden ? std::string::npos : mText.find('\t', static_cast<size_t>(start));
         const int32 stop = tab == std::string::npos ? end : std::min(end, static_cast<int32>(tab));
         const std::string piece = Shown(
@@ -205,7 +214,6 @@ void BTextView::DrawLine(int32 line, float baseline) {
         }
         start = stop + 1;
     }
-    SetDrawingMode(B_OP_COPY);
 }
 
 void BTextView::SelectionMoved() {
@@ -223,7 +231,10 @@ void BTextView::ScrollToSelection() {
 
 void BTextView::ScrollToOffset(int32 offset) {
     float height = 0;
-    const BPoint place = PointAt(offset, &height);
+    BPoint place = PointAt(offset, &height);
+    if (offset == mSelection.Caret()) {
+        place.x += CompositionWidth(mCompositionCaret);
+    }
     const BRect bounds = Bounds();
     BPoint leftTop = bounds.LeftTop();
     if (!mWrap) {
@@ -233,7 +244,8 @@ void BTextView::ScrollToOffset(int32 offset) {
             leftTop.x = std::floor(place.x - kSidewaysMargin);
         }
         // No more empty room behind the text than it needs.
-        const float contentRight = mTextRect.left + mLayout.WidestLine() + mTextRect.left;
+        const float contentRight =
+            mTextRect.left + mLayout.WidestLine() + CompositionWidth(mComposition.size()) + mTextRect.left;
         leftTop.x = std::clamp(leftTop.x, 0.0F, std::max(0.0F, std::ceil(contentRight - bounds.Width())));
     }
     if (place.y < bounds.top || height > bounds.Height()) {

@@ -37,6 +37,7 @@ void BTextView::SetText(const char* text) {
 
 void BTextView::SetText(const char* text, int32 length) {
     const std::string wanted(text == nullptr ? "" : text, LengthOf(text, length));
+    EndComposition();
     mHistory.Clear();
     DeleteText(0, TextLength());
     InsertText(wanted.c_str(), static_cast<int32>(wanted.size()), 0);
@@ -257,6 +258,11 @@ void BTextView::MessageReceived(BMessage* message) {
         return;
     }
     switch (message->what) {
+    case B_INPUT_METHOD_EVENT:
+        if (message->GetInt32("be:opcode", -1) == B_INPUT_METHOD_CHANGED) {
+            SetComposition(message->GetString("be:string", ""), message->GetInt32("be:selection", 0));
+        }
+        break;
     case B_CUT:
         Cut(be_clipboard);
         break;

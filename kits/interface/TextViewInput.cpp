@@ -16,6 +16,7 @@ void BTextView::MouseDown(BPoint where) {
     if (!IsFocus()) {
         MakeFocus();
     }
+    EndComposition();
     const InputState input = current_input(*this);
     const int32 offset = OffsetAt(where);
     const int32 clicks = (std::max(1, input.clicks) - 1) % 3 + 1;

@@ -266,6 +266,11 @@ class BView : public BHandler {
     bool IsFocus() const;
     status_t SetEventMask(uint32 mask, uint32 options = 0);
     uint32 EventMask() const { return mEventMask; }
+    // Until EndRectTracking(), an outline follows the pointer: B_TRACK_WHOLE_RECT moves the rectangle (in
+    // view coordinates) along, B_TRACK_RECT_CORNER only its right bottom corner. It is drawn over all views
+    // of the window, and not beyond it. One for each window; without effect outside of one.
+    void BeginRectTracking(BRect startRect, uint32 style = B_TRACK_WHOLE_RECT);
+    void EndRectTracking();
     // For the time that a button is down; only from MouseDown().
     status_t SetMouseEventMask(uint32 mask, uint32 options = 0);
 

@@ -67,6 +67,10 @@ class ViewHost {
     // Null takes the view's cursor away.
     virtual void SetViewCursor(BView* /*view*/, const BCursor* /*cursor*/) {}
 
+    // See BView; the rectangle on the surface.
+    virtual void BeginRectTracking(BRect /*rect*/, uint32 /*style*/) {}
+    virtual void EndRectTracking() {}
+
     struct DragStart {
         const BMessage* message = nullptr;
         BRect outline;

@@ -15,6 +15,19 @@ void BView::SetViewCursor(const BCursor* cursor, bool /*sync*/) {
     }
 }
 
+void BView::BeginRectTracking(BRect startRect, uint32 style) {
+    if (mHost != nullptr && startRect.IsValid()) {
+        const BPoint leftTop = ConvertToSurface(startRect.LeftTop());
+        mHost->BeginRectTracking(startRect.OffsetToCopy(leftTop), style);
+    }
+}
+
+void BView::EndRectTracking() {
+    if (mHost != nullptr) {
+        mHost->EndRectTracking();
+    }
+}
+
 void BView::DragMessage(BMessage* message, BRect dragRect, BHandler* replyTo) {
     if (mHost == nullptr || message == nullptr || !dragRect.IsValid()) {
         return;

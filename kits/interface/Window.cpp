@@ -168,6 +168,10 @@ BView* BWindow::LastMouseMovedView() const {
 
 void BWindow::Show() {
     if (++mShowLevel == 1) {
+        mTitleToCheck = mHost->Margins() == WindowGeometry::Margins();
+        if (!mTitleToCheck) {
+            KeepTitleInReach();
+        }
         mHost->SetShown(true);
     }
     if (!IsRunning()) {
@@ -197,15 +201,15 @@ void BWindow::Activate(bool active) {
         mMinimized = false;
         mHost->Peer()->activate();
     } else {
-        mHost->Peer()->send_behind();
+        mHost->Peer()->send_behind(nullptr);
     }
 }
 
 status_t BWindow::SendBehind(const BWindow* window) {
-    if (window != nullptr) {
-        return B_UNSUPPORTED;
+    if (window == this) {
+        return B_BAD_VALUE;
     }
-    mHost->Peer()->send_behind();
+    mHost->Peer()->send_behind(window != nullptr ? window->mHost->Peer() : nullptr);
     return B_OK;
 }
 

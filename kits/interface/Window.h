@@ -180,7 +180,8 @@ class BWindow : public BLooper {
     void CenterOnScreen();
     void MoveOnScreen();
 
-    // Calls nest as with views. The first Show() runs the window.
+    // Calls nest as with views. The first Show() runs the window. A window whose title would be out of reach
+    // above the screen is shown as much lower as it takes.
     virtual void Show();
     virtual void Hide();
     bool IsHidden() const;
@@ -188,7 +189,8 @@ class BWindow : public BLooper {
 
     // To the front and active; false sends it behind all others.
     void Activate(bool active = true);
-    // Behind that window, or null for all; where the window manager lets us. B_UNSUPPORTED otherwise.
+    // Behind all other windows for null, else right behind that one, which comes to the front with it; where
+    // the window manager lets us. B_BAD_VALUE for this window.
     status_t SendBehind(const BWindow* window);
     bool IsFront() const;
     bool IsActive() const;
@@ -229,11 +231,14 @@ class BWindow : public BLooper {
     void TakeFrame();
     void TellFrame();
     void SetFrame(BRect frame);
+    void KeepTitleInReach();
 
     std::unique_ptr<WindowHost> mHost;
     int32 mShowLevel = 0;
     bool mMinimized = false;
     bool mActive = false;
+    // Shown, and what the window manager puts around it is not known yet.
+    bool mTitleToCheck = false;
     // What FrameMoved() and FrameResized() were last called for.
     BRect mToldFrame;
 };

@@ -63,6 +63,11 @@ void BWindow::DispatchOwn(BMessage* message, BHandler* handler) {
     case B_PULSE:
         mHost->Pulse();
         return;
+    case B_INPUT_METHOD_EVENT:
+        if (mHost->Focus() != nullptr) {
+            mHost->Focus()->MessageReceived(message);
+        }
+        return;
     default:
         break;
     }
@@ -76,6 +81,12 @@ void BWindow::DispatchOwn(BMessage* message, BHandler* handler) {
         break;
     case kWindowAreaChanged:
         TakeFrame();
+        break;
+    case kWindowMarginsChanged:
+        if (mTitleToCheck) {
+            mTitleToCheck = false;
+            KeepTitleInReach();
+        }
         break;
     case kWindowScaleChanged:
         mHost->TakeScale();

@@ -27,6 +27,12 @@ BMessage PointerMessage(uint32 what, const Input& input) {
     return message;
 }
 
+// What says nothing of the pointer, and so does not part two moves.
+bool IsOfFrame(uint32 what) {
+    return what == kWindowAreaChanged || what == kWindowMarginsChanged || what == kWindowScaleChanged ||
+           what == kWindowUpdate;
+}
+
 uint32 CodeOf(host::PointerInput::Kind kind) {
     switch (kind) {
     case host::PointerInput::Kind::pressed:
@@ -55,7 +61,11 @@ void WindowEvents::PostMove(const BMessage& message) {
     }
     BMessageQueue& queue = mWindow->queue;
     queue.Lock();
-    BMessage* const last = queue.FindMessage(queue.CountMessages() - 1);
+    int32 place = queue.CountMessages() - 1;
+    while (place >= 0 && IsOfFrame(queue.FindMessage(place)->what)) {
+        --place;
+    }
+    BMessage* const last = queue.FindMessage(place);
     if (last != nullptr && last->what == B_MOUSE_MOVED && !last->HasBool("be:left") &&
         last->GetInt32("buttons", 0) == message.GetInt32("buttons", 0) &&
         last->GetInt32("be:drag", 0) == message.GetInt32("be:drag", 0)) {
@@ -112,8 +122,11 @@ void WindowEvents::scale_changed(double scale) {
 }
 
 void WindowEvents::margins_changed(host::FrameMargins margins) {
-    GuardLock guard(mMutex);
-    mMargins = margins;
+    {
+        GuardLock guard(mMutex);
+        mMargins = margins;
+    }
+    Post(BMessage(kWindowMarginsChanged));
 }
 
 void WindowEvents::activated(bool active) {
@@ -171,6 +184,14 @@ void WindowEvents::text_committed(const std::string& text) {
     for (const BMessage& message : TextMessages(text)) {
         Post(message);
     }
+}
+
+void WindowEvents::text_composed(const std::string& text, int caret) {
+    BMessage message(B_INPUT_METHOD_EVENT);
+    message.AddInt32("be:opcode", B_INPUT_METHOD_CHANGED);
+    message.AddString("be:string", text.c_str());
+    message.AddInt32("be:selection", caret);
+    Post(message);
 }
 
 void WindowEvents::drag(const host::DragInput& input) {

@@ -19,6 +19,7 @@ class LooperState;
 // (int32), the number of the drag, while something is dragged.
 inline constexpr uint32 kWindowAreaChanged = '_WAR';
 inline constexpr uint32 kWindowScaleChanged = '_WSL';
+inline constexpr uint32 kWindowMarginsChanged = '_WMC';
 inline constexpr uint32 kWindowStateChanged = '_WST'; // "state" int32, of host::WindowState
 inline constexpr uint32 kWindowDragEnded = '_WDE';    // the drag that the window began is over
 // Posted by a window to itself: draw what is damaged, show what was drawn.
@@ -59,6 +60,7 @@ class WindowEvents : public host::WindowListener {
     void wheel(const host::WheelInput& input) override;
     void key(const host::KeyInput& input) override;
     void text_committed(const std::string& text) override;
+    void text_composed(const std::string& text, int caret) override;
     void drag(const host::DragInput& input) override;
     void drag_ended(bool accepted) override;
     void popups_dismissed() override;

@@ -67,6 +67,19 @@ void BWindow::MoveOnScreen() {
     MoveTo(std::max(left, screen.left + margins.left), std::max(top, screen.top + margins.top));
 }
 
+void BWindow::KeepTitleInReach() {
+    const BRect own = BScreen(this).UsableFrame();
+    if (!own.IsValid() || mHost->Traits().IsPopUp()) {
+        return;
+    }
+    std::vector<BRect> usable = {own};
+    BScreen screen;
+    do {
+        usable.push_back(screen.UsableFrame());
+    } while (screen.SetToNext() == B_OK);
+    SetFrame(WindowGeometry::WithTitleInReach(Frame(), mHost->Margins(), usable));
+}
+
 BRect BWindow::Bounds() const {
     return mHost->Geometry().Bounds();
 }

@@ -25,8 +25,10 @@ void WindowGeometry::MoveTo(BPoint leftTop) {
 }
 
 void WindowGeometry::ResizeTo(float width, float height) {
-    width = std::clamp(std::round(width), mLimits.minWidth, mLimits.maxWidth);
-    height = std::clamp(std::round(height), mLimits.minHeight, mLimits.maxHeight);
+    width = std::clamp(std::round(width), std::min(mLimits.minWidth, kLargest),
+                       std::min(mLimits.maxWidth, kLargest));
+    height = std::clamp(std::round(height), std::min(mLimits.minHeight, kLargest),
+                        std::min(mLimits.maxHeight, kLargest));
     mFrame.right = mFrame.left + width;
     mFrame.bottom = mFrame.top + height;
 }
@@ -36,16 +38,36 @@ void WindowGeometry::Accept(BRect frame) {
 }
 
 void WindowGeometry::SetLimits(const Limits& limits) {
-    const auto least = [](float value) { return std::clamp(std::round(value), 0.0F, kLargest); };
-    mLimits.minWidth = least(limits.minWidth);
-    mLimits.minHeight = least(limits.minHeight);
-    mLimits.maxWidth = std::max(mLimits.minWidth, least(limits.maxWidth));
-    mLimits.maxHeight = std::max(mLimits.minHeight, least(limits.maxHeight));
+    const auto whole = [](float value) { return std::max(0.0F, std::round(value)); };
+    mLimits.minWidth = whole(limits.minWidth);
+    mLimits.minHeight = whole(limits.minHeight);
+    mLimits.maxWidth = std::max(mLimits.minWidth, whole(limits.maxWidth));
+    mLimits.maxHeight = std::max(mLimits.minHeight, whole(limits.maxHeight));
 }
 
 void WindowGeometry::SetZoomLimits(float maxWidth, float maxHeight) {
     mZoomWidth = std::clamp(std::round(maxWidth), 1.0F, kLargest);
     mZoomHeight = std::clamp(std::round(maxHeight), 1.0F, kLargest);
+}
+
+BRect WindowGeometry::WithTitleInReach(BRect frame, const Margins& margins,
+                                       const std::vector<BRect>& usable) {
+    // As much of the title's height as a pointer can take hold of.
+    constexpr float kHold = 8;
+    // What is thinner is a border without a title.
+    if (margins.top < kHold || usable.empty()) {
+        return frame;
+    }
+    const BRect title(frame.left, frame.top - margins.top, frame.right, frame.top - 1);
+    for (const BRect& screen : usable) {
+        const BRect shown = title & screen;
+        if (shown.IsValid() && shown.Height() + 1 >= kHold) {
+            return frame;
+        }
+    }
+    // One that lies beside or below all screens is not the title's matter.
+    const bool isAbove = title.top < usable.front().top && frame.bottom >= usable.front().top;
+    return isAbove ? frame.OffsetToCopy(frame.left, usable.front().top + margins.top) : frame;
 }
 
 BRect WindowGeometry::Zoomed(const BRect& usable, const Margins& margins) {

@@ -4,6 +4,7 @@
 #include <Rect.h>
 
 #include <optional>
+#include <vector>
 
 // Arithmetic alone. Frames are those of the content, on whole pixels. One thread at a time.
 class WindowGeometry {
@@ -18,6 +19,7 @@ class WindowGeometry {
     // As the desktop has made it, whatever the limits are.
     void Accept(BRect frame);
 
+    // As they were set; no frame is larger than 32767, whatever the limits say.
     struct Limits {
         float minWidth = 0;
         float maxWidth = 32767;
@@ -40,6 +42,10 @@ class WindowGeometry {
         float bottom = 0;
         bool operator==(const Margins&) const = default;
     };
+    // Where a frame has to go so that its title, which lies above it, can be got hold of on one of the
+    // screens (their `usable` parts; the first one is the frame's own): as little lower as that takes.
+    // Unchanged while enough of the title shows, so that frames that were saved stay as they are.
+    static BRect WithTitleInReach(BRect frame, const Margins& margins, const std::vector<BRect>& usable);
     // The frame that a zoom leads to: the largest within the limits and, with its margins, on the `usable`
     // part of the screen, moved no further than needed. From there, back to the frame before.
     BRect Zoomed(const BRect& usable, const Margins& margins);

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "MouseTracking.h"
+#include "RectTracking.h"
 #include "Shortcuts.h"
 #include "UpdateRegions.h"
 #include "ViewHost.h"
@@ -45,6 +46,8 @@ class WindowHost : public ViewHost {
     void EventMaskChanged(BView* view) override;
     void SetViewCursor(BView* view, const BCursor* cursor) override;
     void StartDrag(const DragStart& drag) override;
+    void BeginRectTracking(BRect rect, uint32 style) override;
+    void EndRectTracking() override;
     bool UnusedKey(BView* view, const char* bytes, int32 numBytes) override;
     void SetTextCaret(BView* view, BRect caret) override;
 
@@ -116,6 +119,9 @@ class WindowHost : public ViewHost {
     void RefreshPulse();
     void RefreshCursor(BView* under);
     void RefreshTextInput();
+    BPoint LivePointer() const;
+    void OutlineMoved(const std::vector<clipping_rect>& before);
+    void TrackPointer(BPoint place);
     bool InvokeShortcut(uint32 key, uint32 modifiers);
     bool InvokeUsualShortcut(uint32 key, uint32 modifiers);
     bool MoveFocus(bool groups, bool backward);
@@ -143,6 +149,7 @@ class WindowHost : public ViewHost {
     int32 mMessageDepth = 0;
 
     MouseTracking mMouse;
+    RectTracking mOutline;
     // The data of the drag above the window, turned into a message once.
     int32 mDragNumber = 0;
     std::unique_ptr<BMessage> mDragMessage;

@@ -1,6 +1,7 @@
 #include "WindowLoop.h"
 
 #include "TokenTable.h"
+#include "WindowHost.h"
 
 #include <Application.h>
 #include <OS.h>
@@ -9,9 +10,11 @@
 #include "host/api/display.h"
 #include "host/api/threads.h"
 
+#include <algorithm>
 #include <chrono>
 #include <cstdio>
 #include <string>
+#include <vector>
 
 namespace {
 
@@ -107,7 +110,32 @@ bool WindowLoop::WaitForQuit(bigtime_t timeout) {
     return mQuits;
 }
 
-void WindowLoop::Activate(const std::string&) {
+bool WindowLoop::CloseWindows() {
+    std::vector<std::shared_ptr<LooperState>> all = LooperTable::Instance().All();
+    std::reverse(all.begin(), all.end());
+    for (const std::shared_ptr<LooperState>& state : all) {
+        const bigtime_t patience = state->thread == 0 ? 0 : B_INFINITE_TIMEOUT;
+        if (!state->IsOpen() || state->looper == be_app || state->lock.Lock(patience) != B_OK) {
+            continue;
+        }
+        auto* const window = state->IsOpen() ? dynamic_cast<BWindow*>(state->looper) : nullptr;
+        if (window == nullptr || window->Host()->Traits().IsPopUp()) {
+            state->lock.Unlock();
+            continue;
+        }
+        if (!window->QuitRequested()) {
+            state->lock.Unlock();
+            return false;
+        }
+        if (state->IsOpen()) {
+            window->Quit();
+        }
+    }
+    return true;
+}
+
+void WindowLoop::Activate(const std::string& token) {
+    host::take_activation_token(token);
     for (const std::shared_ptr<LooperState>& state : LooperTable::Instance().All()) {
         if (!state->IsOpen() || state->looper == be_app || state->lock.Lock(kShortPatience) != B_OK) {
             continue;

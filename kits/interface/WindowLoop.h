@@ -20,8 +20,10 @@ class WindowLoop : public MainLoop {
     bool Prepare() override;
     bool Run() override;
     void Quit() override;
-    // Every window that is not hidden, the last made in front. One that is busy stays where it is. The token
-    // is not used yet: a Wayland compositor may only mark the windows instead.
+    // Waits for a window that is busy. One that does not run yet is another thread's in the making and is
+    // left alone; pop-ups belong to their menus.
+    [[nodiscard]] bool CloseWindows() override;
+    // Every window that is not hidden, the last made in front. One that is busy stays where it is.
     void Activate(const std::string& token) override;
 
     // Constructed once, before main().

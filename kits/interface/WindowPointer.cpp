@@ -132,8 +132,51 @@ void WindowHost::MouseUp(BMessage& message, BHandler* handler) {
     }
 }
 
+void WindowHost::BeginRectTracking(BRect rect, uint32 style) {
+    EndRectTracking();
+    const BMessage* const message = mWindow.CurrentMessage();
+    mOutline.Begin(rect, style,
+                   message != nullptr && IsOfPointer(message->what) ? PlaceOf(*message) : LivePointer());
+    OutlineMoved({});
+}
+
+void WindowHost::EndRectTracking() {
+    const std::vector<clipping_rect> before = mOutline.Sides(Surface().LogicalBounds());
+    if (mOutline.IsActive()) {
+        mOutline.End();
+        OutlineMoved(before);
+    }
+}
+
+void WindowHost::TrackPointer(BPoint place) {
+    const std::vector<clipping_rect> before = mOutline.Sides(Surface().LogicalBounds());
+    if (mOutline.PointerAt(place)) {
+        OutlineMoved(before);
+    }
+}
+
+// What it lay on before, and lies on now, is shown anew.
+void WindowHost::OutlineMoved(const std::vector<clipping_rect>& before) {
+    for (const clipping_rect& side : before) {
+        SurfaceChanged(side);
+    }
+    if (mOutline.IsActive()) {
+        for (const clipping_rect& side : mOutline.Sides(Surface().LogicalBounds())) {
+            SurfaceChanged(side);
+        }
+    }
+}
+
+BPoint WindowHost::LivePointer() const {
+    const host::LiveInput live = host::live_input();
+    return BPoint(static_cast<float>(std::floor(live.on_screen.x)),
+                  static_cast<float>(std::floor(live.on_screen.y))) -
+           ScreenOrigin();
+}
+
 void WindowHost::MouseMoved(BMessage& message, BHandler* /*handler*/) {
     const BPoint place = PlaceOf(message);
+    TrackPointer(place);
     BView* const under = message.HasBool("be:left") ? nullptr : ViewAt(place);
     const BMessage* const dragged = DragMessageOf(message);
     mMouse.Moved(under);
@@ -165,6 +208,7 @@ bool WindowHost::GetMouse(BView* /*view*/, BPoint* surfacePoint, uint32* buttons
         queue->Unlock();
         if (next != nullptr) {
             *surfacePoint = PlaceOf(*next);
+            TrackPointer(*surfacePoint);
             *buttons = ButtonsOf(*next);
             if (next->what == B_MOUSE_UP && *buttons == 0) {
                 mMouse.Released();
@@ -172,11 +216,11 @@ bool WindowHost::GetMouse(BView* /*view*/, BPoint* surfacePoint, uint32* buttons
             return true;
         }
     }
-    const host::LiveInput live = host::live_input();
-    *surfacePoint = BPoint(static_cast<float>(std::floor(live.on_screen.x)),
-                           static_cast<float>(std::floor(live.on_screen.y))) -
-                    ScreenOrigin();
-    *buttons = live.buttons;
+    *surfacePoint = LivePointer();
+    *buttons = host::live_input().buttons;
+    if (mWindow.Thread() == find_thread(nullptr)) {
+        TrackPointer(*surfacePoint);
+    }
     return true;
 }
 

@@ -2,6 +2,8 @@
 
 #include "PopUpHost.h"
 
+#include <algorithm>
+
 bool WindowTraits::IsModal() const {
     return feel == B_MODAL_APP_WINDOW_FEEL || feel == B_MODAL_SUBSET_WINDOW_FEEL ||
            feel == B_MODAL_ALL_WINDOW_FEEL;
@@ -91,7 +93,8 @@ host::WindowOptions WindowTraits::Options(const WindowGeometry& geometry) const 
     if (IsPopUp()) {
         return options;
     }
-    const auto pixels = [](float extent) { return static_cast<int>(extent) + 1; };
+    // No display knows of larger windows.
+    const auto pixels = [](float extent) { return static_cast<int>(std::min(extent, 32766.0F)) + 1; };
     const WindowGeometry::Limits& limits = geometry.SizeLimits();
     const BRect& frame = geometry.Frame();
     options.least = {pixels(fixedWidth ? frame.Width() : limits.minWidth),

@@ -128,7 +128,14 @@ void WindowHost::Flush() {
         const clipping_rect device = surface.ToDevice(rect);
         changed.push_back({device.left, device.top, device.right + 1, device.bottom + 1});
     }
+    // The outline lies over the picture and never is a part of it.
+    if (mOutline.IsActive()) {
+        mOutline.InvertOutline(surface);
+    }
     mPeer->present(mPixels.data(), static_cast<size_t>(mPixelSize.width), mPixelSize, changed);
+    if (mOutline.IsActive()) {
+        mOutline.InvertOutline(surface);
+    }
 }
 
 void WindowHost::Sync() {

@@ -13,7 +13,6 @@
 namespace {
 
 constexpr float kMinRowHeight = 20;
-constexpr float kTextSize = 14;
 constexpr float kTextInset = 2;
 constexpr float kCoverInset = 2;
 constexpr BRect kSmallCover(0, 0, 15, 15);

@@ -23,12 +23,17 @@ enum PlayListColumn : int32 {
 // Owns the file's metadata, which it reads once, when it is made. Thread rule: that of BListItem.
 class PlayListItem : public CLVListItem {
   public:
+    // Of the texts, in pixels.
+    static constexpr float kTextSize = 14;
+
     // Tags the file from its and its folder's name where it has no attributes.
     explicit PlayListItem(entry_ref* ref);
     ~PlayListItem() override;
 
     // Copies the file's reference.
     void GetRef(entry_ref* out) const;
+    // The small cover in it is the row's.
+    BrindleMetaData& MetaData() { return *mMetaData; }
     const BrindleMetaData& MetaData() const { return *mMetaData; }
 
     void DrawItemColumn(BView* owner, BRect columnRect, int32 columnIndex, bool complete) override;

@@ -22,6 +22,8 @@ PlayListView::PlayListView(BRect frame, CLVContainerView** container_out)
     : ColumnListView(frame, container_out, "playlist", B_FOLLOW_ALL_SIDES,
                      B_WILL_DRAW | B_PULSE_NEEDED | B_FRAME_EVENTS | B_NAVIGABLE, B_MULTIPLE_SELECTION_LIST,
                      true, true, true, false, B_NO_BORDER, be_plain_font) {
+    // That of the rows' texts, which they would set as they are drawn.
+    SetFontSize(PlayListItem::kTextSize);
     AddColumns();
     SetSortFunction(PlayListItem::CompareFunc);
 }
@@ -91,8 +93,19 @@ void PlayListView::KeyDown(const char* bytes, int32 count) {
         RemoveSelection();
         break;
     default:
+        mKeyInvokes = true;
         BListView::KeyDown(bytes, count);
+        mKeyInvokes = false;
     }
+}
+
+status_t PlayListView::Invoke(BMessage* message) {
+    // A double click opens its song by itself.
+    bool notifying = false;
+    InvokeKind(&notifying);
+    if (mKeyInvokes && message == nullptr && !notifying)
+        OpenItem(CurrentSelection(0));
+    return ColumnListView::Invoke(message);
 }
 
 void PlayListView::MessageReceived(BMessage* message) {

@@ -46,9 +46,11 @@ class PlayListView : public ColumnListView {
     void MouseDown(BPoint where) override;
     void MouseMoved(BPoint where, uint32 transit, const BMessage* drag) override;
     void MouseUp(BPoint where) override;
+    // Delete removes the selection, Space opens the first selected song, Return does nothing.
     void KeyDown(const char* bytes, int32 count) override;
     void Pulse() override;
     void MessageReceived(BMessage* message) override;
+    status_t Invoke(BMessage* message = nullptr) override;
 
     bool AddItem(BListItem* item) override;
     bool AddItem(BListItem* item, int32 full_index) override;
@@ -103,6 +105,9 @@ class PlayListView : public ColumnListView {
     WalkingAnts mAnts;
     // The last drag that came in with "refs".
     std::unique_ptr<BMessage> mDragMessage;
+
+    // A key that is being handled invokes the list.
+    bool mKeyInvokes = false;
 
     ListedRefs mListedRefs;
     std::vector<std::unique_ptr<PlayListItem>> mOwnRows;

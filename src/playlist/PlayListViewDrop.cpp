@@ -1,7 +1,10 @@
 // The part of PlayListView that takes in dragged files.
 #include "playlist/PlayListView.h"
 
+#include <CopyText.h>
+#include <Errors.h>
 #include <Message.h>
+#include <MimeType.h>
 #include <Node.h>
 #include <NodeInfo.h>
 #include <StorageDefs.h>
@@ -15,8 +18,13 @@ bool IsAudio(const entry_ref& ref) {
     BNode node(&ref);
     BNodeInfo info(&node);
     char type[B_MIME_TYPE_LENGTH] = "";
-    if (info.GetType(type) != B_OK)
-        return false;
+    if (const status_t status = info.GetType(type); status != B_OK) {
+        // Most files come from places where nothing has given them a type yet.
+        BMimeType guess;
+        if (status != B_ENTRY_NOT_FOUND || BMimeType::GuessMimeType(&ref, &guess) != B_OK)
+            return false;
+        CopyText(type, guess.Type());
+    }
     type[strcspn(type, "/")] = '\0';
     return strcmp(type, "audio") == 0;
 }

@@ -1,10 +1,10 @@
 // The part of PlayListView that selects, drags out and opens with the mouse.
 #include "playlist/PlayListView.h"
 
+#include "playlist/FolderMenu.h"
 #include "playlist/PlayListItem.h"
 #include "widgets/IconMenuItem.h"
 
-#include <Entry.h>
 #include <InterfaceDefs.h>
 #include <Message.h>
 #include <MessageQueue.h>
@@ -48,12 +48,7 @@ void PlayListView::ShowFolderMenu(PlayListItem* item, BPoint where) {
     if (item != nullptr) {
         entry_ref ref;
         item->GetRef(&ref);
-        BEntry entry(&ref);
-        auto* const file = new IconMenuItem(&entry);
-        file->SetEnabled(false);
-        menu.AddItem(file);
-        while (entry.GetParent(&entry) == B_OK)
-            menu.AddItem(new IconMenuItem(&entry));
+        AddFileAndFolders(menu, ref);
     }
     const BPoint corner = ConvertToScreen(where) - BPoint(kMenuOffset, kMenuOffset);
     if (auto* const chosen = dynamic_cast<IconMenuItem*>(menu.Go(corner, false, false, false));

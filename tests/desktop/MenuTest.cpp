@@ -81,6 +81,44 @@ TEST_F(MenuTest, ClickAndClickChoosesAndPointingOpensTheNextMenu) {
     });
 }
 
+TEST_F(MenuTest, AnOpenMenuGrowsWithItsLabels) {
+    RunWithDisplay([this] {
+        auto* const window = OpenWithMenus();
+        TheDesktop().click(FileTitle().x, FileTitle().y);
+        EXPECT_TRUE(Becomes(Open(), kMenuGround));
+        const Place beside = {mLeft + 250, mTop + 30};
+        EXPECT_EQ(TheDesktop().pixel(beside.x, beside.y), kView);
+
+        ASSERT_TRUE(window->Lock());
+        window->file->ItemAt(2)->SetLabel("Close this window and forget everything that has been in it");
+        window->Unlock();
+
+        EXPECT_TRUE(Becomes(beside, kMenuGround));
+        TheDesktop().click(mLeft + 250, Close().y);
+        EXPECT_TRUE(mNotes.WaitFor("clos index 2"));
+        CloseWindow(window);
+    });
+}
+
+TEST_F(MenuTest, AMenuCanBeShownWithoutAnybodyChoosing) {
+    struct ShownMenu : public BMenu {
+        ShownMenu() : BMenu("shown") { AddItem(new BMenuItem("an item", nullptr)); }
+        using BMenu::Hide;
+        using BMenu::Show;
+        BPoint ScreenLocation() override { return {700, 500}; }
+    };
+    RunWithDisplay([] {
+        ShownMenu menu;
+        EXPECT_EQ(TheDesktop().pixel(704, 504), 0x000000U);
+        menu.Show(true);
+        EXPECT_TRUE(TheDesktop().becomes(704, 504, kSelection));
+        menu.Hide();
+        EXPECT_TRUE(TheDesktop().becomes(704, 504, 0x000000));
+        menu.Show();
+        EXPECT_TRUE(TheDesktop().becomes(704, 504, kMenuGround));
+    });
+}
+
 TEST_F(MenuTest, AltArrowsEnterAndEscape) {
     RunWithDisplay([this] {
         BWindow* const window = OpenWithMenus();

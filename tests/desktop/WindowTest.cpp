@@ -52,6 +52,70 @@ TEST_F(WindowTest, ASavedFrameIsRestoredExactly) {
     });
 }
 
+TEST_F(WindowTest, TenRestartsDoNotMoveIt) {
+    RunApplication([this] {
+        BRect saved(150, 160, 449, 359);
+        for (int start = 0; start < 10; ++start) {
+            BWindow* const window = Open(saved, "Again", MakeView(), kBlue);
+            snooze(200000);
+            const BRect frame = FrameOf(window);
+            EXPECT_EQ(frame, BRect(150, 160, 449, 359)) << "start " << start;
+            saved = frame;
+            Close(window);
+            mNotes.Take();
+        }
+    });
+}
+
+TEST_F(WindowTest, ATitleIsNotLeftAboveTheScreenAndStaysWhereItWasPut) {
+    RunApplication([this] {
+        BRect saved(0, 0, 299, 199);
+        BRect first;
+        for (int start = 0; start < 10; ++start) {
+            BWindow* const window = Open(saved, "Top", MakeView(), kBlue);
+            snooze(300000);
+            ASSERT_TRUE(window->Lock());
+            const BRect around = window->DecoratorFrame();
+            saved = window->Frame();
+            window->Unlock();
+            EXPECT_EQ(around.top, 0) << "start " << start;
+            EXPECT_GT(saved.top, 8) << "there is a title";
+            first = start == 0 ? saved : first;
+            EXPECT_EQ(saved, first) << "start " << start;
+            Close(window);
+            mNotes.Take();
+        }
+        EXPECT_EQ(first.Width(), 299);
+        EXPECT_EQ(first.Height(), 199);
+    });
+}
+
+TEST_F(WindowTest, AnEmptyTitleShowsNoOtherName) {
+    RunApplication([this] {
+        auto* const window = new NotingWindow(BRect(300, 200, 599, 399), mNotes);
+        window->SetTitle("");
+        window->Show();
+        ASSERT_TRUE(mNotes.WaitFor("window: active"));
+        EXPECT_EQ(TheDesktop().tool({"getactivewindow", "getwindowname"}), " ");
+        Close(window);
+    });
+}
+
+TEST_F(WindowTest, AWindowGoesBehindAnother) {
+    RunApplication([this] {
+        BWindow* const below = Open(BRect(300, 200, 599, 399), "Below", MakeView(), kBlue);
+        BWindow* const above = Open(BRect(350, 250, 649, 449), "Above", MakeView(), kOrange);
+        EXPECT_TRUE(TheDesktop().becomes(450, 300, 0xf08c0a));
+        ASSERT_TRUE(above->Lock());
+        EXPECT_EQ(above->SendBehind(above), B_BAD_VALUE);
+        EXPECT_EQ(above->SendBehind(below), B_OK);
+        above->Unlock();
+        EXPECT_TRUE(TheDesktop().becomes(450, 300, 0x0a14c8));
+        Close(above);
+        Close(below);
+    });
+}
+
 TEST_F(WindowTest, TheCloseBoxAsksTheWindow) {
     RunApplication([this] {
         BWindow* const window = Open(BRect(300, 200, 599, 399), "Closing", MakeView(), kBlue);

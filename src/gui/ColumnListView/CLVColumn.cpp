@@ -59,15 +59,20 @@ void InvalidateIfValid(BView* view, BRect rect) {
     }
 }
 
-void MovePixels(BView* view, float oldEnd, float growth) {
-    BWindow* const window = view->Window();
-    if (window != nullptr) {
-        window->UpdateIfNeeded();
-        if (window->NeedsUpdate()) {
-            // What is not drawn yet must not be moved away from where it will be.
-            InvalidateStrip(view, std::min(oldEnd, oldEnd + growth) + 1, view->Bounds().right);
-            return;
-        }
+// Whether everything is drawn, as the columns lie now.
+bool BringUpToDate(BWindow* window) {
+    if (window == nullptr) {
+        return true;
+    }
+    window->UpdateIfNeeded();
+    return !window->NeedsUpdate();
+}
+
+void MovePixels(BView* view, float oldEnd, float growth, bool upToDate) {
+    if (!upToDate) {
+        // What is not drawn yet must not be moved away from where it will be.
+        InvalidateStrip(view, std::min(oldEnd, oldEnd + growth) + 1, view->Bounds().right);
+        return;
     }
     const PixelMove move = PixelMoveFor(view->Bounds(), oldEnd, growth);
     if (move.target.IsValid()) {
@@ -146,6 +151,8 @@ void CLVColumn::SetWidth(float new_width) {
 
 void CLVColumn::ShowWidthChange(float growth) {
     CLVColumnLabelView* const header = mParent->HeaderView();
+    // Once for both views: what the first has moved must not be drawn before the columns are laid out anew.
+    const bool upToDate = BringUpToDate(mParent->Window());
     if ((mFlags & CLV_COLUMN_HEADER_TRUNCATE) != 0) {
         // The whole label, as an ellipsis may draw the letter before it nearer, or change its shape.
         if (TruncateText(mWidth) != kNowhere) {
@@ -153,8 +160,8 @@ void CLVColumn::ShowWidthChange(float growth) {
         }
     }
     const float oldEnd = mColumnEnd;
-    MovePixels(header, oldEnd, growth);
-    MovePixels(mParent, oldEnd, growth);
+    MovePixels(header, oldEnd, growth, upToDate);
+    MovePixels(mParent, oldEnd, growth, upToDate);
     const float border = std::min(oldEnd, oldEnd + growth);
     InvalidateStrip(header, border, border);
     mParent->UpdateColumnSizesDataRectSizeScrollBars(false);

@@ -4,6 +4,17 @@
 
 namespace {
 
+TEST_F(Lists, RowsLearnOfAFontThatIsAnotherOneOnly) {
+    Fill(2);
+    mStage.Locked([&] {
+        const int before = mRows[0]->updated;
+        mList->SetFontSize(30);
+        EXPECT_EQ(mRows[0]->updated, before + 1);
+        mList->SetFontSize(30);
+        EXPECT_EQ(mRows[0]->updated, before + 1);
+    });
+}
+
 TEST_F(Lists, RowsLieBelowEachOther) {
     Fill(3);
     mStage.Locked([&] {

@@ -18,8 +18,11 @@ class MenuStageOnPaper : public MenuStage {
         mShown.emplace_back(menu, pane);
         return true;
     }
-    void Scrolled(BMenu* menu, const MenuPane& pane) override { Find(menu)->second = pane; }
+    void PaneChanged(BMenu* menu, const MenuPane& pane) override { Find(menu)->second = pane; }
     void Hide(BMenu* menu) override { mShown.erase(Find(menu)); }
+
+    void MakingUp(BRect item) override { madeUpItem = item; }
+    bool UserLeaves() override { return leavesAfter >= 0 && leavesAfter-- == 0; }
 
     // The names of the shown menus, as "File Recent".
     std::string Names() const {
@@ -37,6 +40,9 @@ class MenuStageOnPaper : public MenuStage {
     }
 
     BRect screen{0, 0, 1023, 767};
+    BRect madeUpItem;
+    // How many more times the user stays while a menu is made up; negative for always.
+    int leavesAfter = -1;
 
   private:
     std::vector<std::pair<BMenu*, MenuPane>>::iterator Find(BMenu* menu) {

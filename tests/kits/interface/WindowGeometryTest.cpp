@@ -23,7 +23,39 @@ TEST(WindowGeometry, ContradictoryLimitsGiveWayToTheMinimum) {
     WindowGeometry geometry(BRect(0, 0, 99, 99));
     geometry.SetLimits({300, 100, 0, 1000000});
     EXPECT_EQ(geometry.SizeLimits().maxWidth, 300);
-    EXPECT_EQ(geometry.SizeLimits().maxHeight, 32767);
+    EXPECT_EQ(geometry.SizeLimits().maxHeight, 1000000) << "as it was set";
+    geometry.ResizeTo(200, 999999);
+    EXPECT_EQ(geometry.Frame(), BRect(0, 0, 300, 32767));
+}
+
+TEST(WindowGeometry, ATitleAboveTheScreenIsBroughtIntoReach) {
+    const WindowGeometry::Margins margins{1, 20, 1, 5};
+    const struct {
+        const char* what;
+        BRect frame;
+        std::vector<BRect> screens;
+        BRect wanted;
+    } cases[] = {
+        {"at the very top", {0, 0, 99, 99}, {{0, 0, 1279, 1023}}, {0, 20, 99, 119}},
+        {"too little of it", {30, 7, 129, 99}, {{0, 0, 1279, 1023}}, {30, 20, 129, 112}},
+        {"enough of it", {30, 8, 129, 99}, {{0, 0, 1279, 1023}}, {30, 8, 129, 99}},
+        {"all of it", {30, 20, 129, 99}, {{0, 0, 1279, 1023}}, {30, 20, 129, 99}},
+        {"behind a panel", {30, 40, 129, 99}, {{0, 32, 1279, 1023}}, {30, 40, 129, 99}},
+        {"wholly behind it", {30, 32, 129, 99}, {{0, 32, 1279, 1023}}, {30, 52, 129, 119}},
+        {"on the screen above",
+         {30, 1024, 129, 1099},
+         {{0, 1024, 1279, 2047}, {0, 0, 1279, 1023}},
+         {30, 1024, 129, 1099}},
+        {"left of everything", {-300, 0, -200, 99}, {{0, 0, 1279, 1023}}, {-300, 20, -200, 119}},
+        {"below everything", {30, 3000, 129, 3099}, {{0, 0, 1279, 1023}}, {30, 3000, 129, 3099}},
+    };
+    for (const auto& each : cases) {
+        EXPECT_EQ(WindowGeometry::WithTitleInReach(each.frame, margins, each.screens), each.wanted)
+            << each.what;
+    }
+    EXPECT_EQ(WindowGeometry::WithTitleInReach({0, 0, 9, 9}, {1, 1, 1, 1}, {{0, 0, 99, 99}}),
+              BRect(0, 0, 9, 9))
+        << "no title";
 }
 
 TEST(WindowGeometry, FramesLieOnWholePixels) {

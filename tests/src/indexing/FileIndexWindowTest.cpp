@@ -93,9 +93,8 @@ TEST_F(IndexerWindow, IsNeverSmallerThanItOpened) {
         mWindow->GetSizeLimits(&minWidth, &maxWidth, &minHeight, &maxHeight);
         EXPECT_EQ(minWidth, 450);
         EXPECT_EQ(minHeight, 200);
-        // As large as a window can be.
-        EXPECT_EQ(maxWidth, 32767);
-        EXPECT_EQ(maxHeight, 32767);
+        EXPECT_EQ(maxWidth, 1000000);
+        EXPECT_EQ(maxHeight, 1000000);
         mWindow->ResizeTo(10, 10);
         EXPECT_EQ(mWindow->Bounds(), BRect(0, 0, 450, 200));
     });

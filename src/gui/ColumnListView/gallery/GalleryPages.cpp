@@ -18,7 +18,7 @@ void AddStockColumns(GalleryList& list, unsigned long partFlags = 0) {
     list.MakeColumn("Part", 130, kUsual | partFlags);
     list.MakeColumn("Maker", 100, kUsual);
     list.MakeColumn("Shelf", 50, kUsual);
-    list.MakeColumn("Count", 50, kUsual);
+    list.MakeColumn("Count", 60, kUsual);
     list.MakeColumn("Price", 60, kUsual);
     list.MakeColumn("Note", 200, kUsual);
 }
@@ -103,8 +103,8 @@ void FillColumns(GalleryList& list) {
     list.MakeColumn("and bound", 90, kUsual);
     list.MakeColumn("Free", 80, kUsual);
     list.MakeColumn("Hidden", 80, kUsual | CLV_COLUMN_HIDDEN);
-    list.MakeColumn("Not movable", 90, kUsual | CLV_COLUMN_NOT_MOVABLE);
-    list.MakeColumn("Not resizable", 90, kUsual | CLV_COLUMN_NOT_RESIZABLE);
+    list.MakeColumn("Not movable", 100, kUsual | CLV_COLUMN_NOT_MOVABLE);
+    list.MakeColumn("Not resizable", 110, kUsual | CLV_COLUMN_NOT_RESIZABLE);
     list.MakeColumn("At end", 80, kUsual | CLV_COLUMN_LOCK_AT_END);
     for (int32 i = 0; i < 30; ++i) {
         const StockItem item(i);
@@ -143,7 +143,7 @@ constexpr std::array<GalleryPage, 7> kPages = {{
     {"outline", "An outline of three levels", 640, 460, true, FillOutline},
     {"texts", "Texts longer than their cells", 460, 280, false, FillTexts},
     {"pictures", "Pictures in cells", 460, 380, false, FillPictures},
-    {"columns", "Columns of all kinds", 680, 380, false, FillColumns},
+    {"columns", "Columns of all kinds", 720, 380, false, FillColumns},
     {"sorting", "Sorted by several keys", 640, 460, false, FillSorting},
     {"many", "Fifty thousand rows", 640, 460, true, FillMany},
 }};
