@@ -282,8 +282,16 @@ void ScreenWindow::present(WindowPicture::Extent extent) {
     }
     QImage* const target = direct ? image : &copy;
     if (!target->isNull()) {
+        uchar* const bits = target->bits();
+        if (bits != stored_bits_ || target->bytesPerLine() != stored_row_) {
+            // Other memory than last time holds less than was shown: the store works with several buffers, or
+            // has made a new one to have room for a frame.
+            extent = WindowPicture::Extent::all;
+            stored_bits_ = bits;
+            stored_row_ = target->bytesPerLine();
+        }
         const std::vector<DeviceRect> written =
-            picture_->take(extent, reinterpret_cast<std::uint32_t*>(target->bits()),
+            picture_->take(extent, reinterpret_cast<std::uint32_t*>(bits),
                            static_cast<std::size_t>(target->bytesPerLine()) / sizeof(std::uint32_t),
                            {target->width(), target->height()});
         const double scale = devicePixelRatio();

@@ -81,6 +81,9 @@ class ScreenWindow : public QWindow {
     std::shared_ptr<WindowListener> listener_;
     WindowOptions options_;
     QBackingStore store_;
+    // Where the store had its pixels when they were written last, and the bytes of a row of them.
+    const uchar* stored_bits_ = nullptr;
+    qsizetype stored_row_ = 0;
     QBasicTimer frame_timer_;
     QBasicTimer pulse_timer_;
     QElapsedTimer since_present_;
