@@ -17,7 +17,7 @@ class MpvPlayer : public Player {
     MpvPlayer(const MpvPlayer&) = delete;
     MpvPlayer& operator=(const MpvPlayer&) = delete;
 
-    /// EINVAL for an output that libmpv does not know.
+    /// EINVAL for a malformed output.
     Status start(const std::string& output);
 
     Status load(const std::string& path) override;
