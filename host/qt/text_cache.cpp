@@ -11,6 +11,8 @@ namespace {
 constexpr std::size_t most_heights = 64;
 // What an entry costs beside its texts and masks.
 constexpr std::size_t entry_bytes = 256;
+// For each one that is kept.
+constexpr int freed_at_once = 8;
 
 std::size_t bytes_of(const KnownText& known) {
     return (known.advances ? known.advances->size() * sizeof(float) : 0) +
@@ -38,7 +40,11 @@ KnownText* TextCache::look_up(const FontKey& font, std::string_view text) {
 }
 
 void TextCache::make_room(std::size_t bytes) {
+    for (int i = 0; i < freed_at_once && !going_.empty(); ++i) {
+        going_.erase(going_.begin());
+    }
     if (young_bytes_ + bytes > most_bytes_) {
+        going_ = std::move(old_);
         old_ = std::move(young_);
         young_.clear();
         young_bytes_ = 0;
@@ -100,6 +106,7 @@ void TextCache::clear() {
     const MutexLock lock(mutex_);
     young_.clear();
     old_.clear();
+    going_.clear();
     young_bytes_ = 0;
     heights_.clear();
 }

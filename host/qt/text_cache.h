@@ -33,7 +33,7 @@ struct KnownText {
 
 class TextCache {
   public:
-    // Keeps up to twice that many bytes.
+    // Keeps up to twice that many bytes, for a moment three times as many.
     explicit TextCache(std::size_t bytes) : most_bytes_(bytes) {}
 
     // Texts longer than this many bytes are not kept.
@@ -78,9 +78,10 @@ class TextCache {
     const std::size_t most_bytes_;
     Mutex mutex_;
     // Two generations: what is used moves into the young one; when that is full it becomes the old one, and
-    // what nobody has used meanwhile goes.
+    // what nobody has used meanwhile goes, a few at a time so that no frame waits for thousands.
     Texts young_ GUARDED_BY(mutex_);
     Texts old_ GUARDED_BY(mutex_);
+    Texts going_ GUARDED_BY(mutex_);
     std::size_t young_bytes_ GUARDED_BY(mutex_) = 0;
     std::vector<std::pair<FontKey, FontHeight>> heights_ GUARDED_BY(mutex_);
 };
