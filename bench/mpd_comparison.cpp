@@ -1,14 +1,17 @@
-// First indexing and a rare search beside a Music Player Daemon of Debian's packages, on the same library.
+// First indexing, a rare search, and that search in the find window, beside a Music Player Daemon of Debian's
+// packages, on the same library.
 //
 // Usage: mpd_comparison [FILES [FRAMES [FOLDER]]]     100000 files of 80 frames (2 s), a temporary folder
 
 #include "app/QuirnelApp.h"
 #include "indexing/FileIndexListItem.h"
 #include "samples/SampleLibrary.h"
+#include "search/FindWindow.h"
 #include "search/SongQuery.h"
 #include "support/Figures.h"
 #include "support/MpdClient.h"
 #include "support/Surroundings.h"
+#include <Autolock.h>
 #include <IndexMaintenance.h>
 #include <OS.h>
 #include <Query.h>
@@ -98,6 +101,27 @@ int Compare(const fs::path& folder, const fs::path& script, std::size_t count, i
     reached &=
         bench::Report("search for a rare text", bench::Median(ours), "ms", "mpd, count \"(any contains ..)\"",
                       bench::Median(theirs), 1.0 / 20, bench::Better::lower);
+
+    brindle_app = &app;
+    setenv("QT_QPA_PLATFORM", "offscreen", 1);
+    auto* const window = new FindWindow(nullptr);
+    std::vector<double> painted;
+    std::vector<double> counted;
+    for (int round = 0; round < kRounds; ++round) {
+        const BAutolock lock(window);
+        const bench::Stopwatch watch;
+        window->SearchFor(rare.c_str());
+        window->UpdateIfNeeded();
+        painted.push_back(watch.Seconds() * 1e3);
+        const bench::Stopwatch other;
+        mpd.CountSongs(rare);
+        counted.push_back(other.Seconds() * 1e3);
+    }
+    reached &=
+        bench::Report("find window, Enter to painted list", bench::Median(painted), "ms",
+                      "mpd, count \"(any contains ..)\"", bench::Median(counted), 1, bench::Better::lower);
+    app.FindWindowSlot().Close();
+    brindle_app = nullptr;
     close_indices();
     return reached ? 0 : 1;
 }
