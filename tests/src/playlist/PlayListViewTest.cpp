@@ -229,8 +229,11 @@ TEST_F(PlayList, TheSystemsSelectAllSelectsAllRows) {
     BMessenger(mList).SendMessage(B_SELECT_ALL);
     Settle();
     EXPECT_EQ(Selection(), (Numbers{0, 1, 2, 3, 4}));
+    Select({2});
     Key("a", host::KeyName::none, host::control_modifier);
-    EXPECT_EQ(Selection().size(), 5u);
+    // The window has posted the command behind.
+    Settle();
+    EXPECT_EQ(Selection(), (Numbers{0, 1, 2, 3, 4}));
 }
 
 TEST_F(PlayList, SelectAllInAnEmptyListIsNothing) {

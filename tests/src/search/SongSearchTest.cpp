@@ -159,6 +159,22 @@ TEST_F(SongSearch, AVolumeThatHasGoneEndsSilently) {
     std::filesystem::create_directory(passing);
 }
 
+TEST_F(SongSearch, AVolumeThatComesLaterIsSearchedByTheNextWindow) {
+    const std::string& passing = TestVolumes::Instance().Passing();
+    std::filesystem::remove_all(passing);
+    MakeSong("1.mp3", "Here");
+    Open();
+    std::filesystem::create_directory(passing);
+    mApp->CreateIndices(MakeItem(passing)->Entry().volume.get());
+    std::ofstream(passing + "/later.mp3") << "not music";
+    Write(passing + "/later.mp3", "Audio:Songname", "Here later");
+    EXPECT_EQ(Find("Here"), Names{"1.mp3"});
+
+    mApp->FindWindowSlot().Close();
+    Open();
+    EXPECT_EQ(Find("Here"), (Names{"1.mp3", "later.mp3"}));
+}
+
 TEST_F(SongSearch, WorksWhileAJobTagsTheSameVolume) {
     constexpr int kFiles = 400;
     for (int i = 0; i < kFiles; ++i)
