@@ -26,7 +26,14 @@ class ViewStage : private ViewHost {
         memset(mBitmap.Bits(), 0xFF, static_cast<size_t>(mBitmap.BitsLength()));
         mLooper->Run();
     }
-    ~ViewStage() override {
+    ~ViewStage() override { Close(); }
+    // The last that is asked of it. For the destructors of stages that other threads ask, too: what they
+    // override must not be gone before the views are.
+    void Close() {
+        if (mClosed) {
+            return;
+        }
+        mClosed = true;
         mLooper->Lock();
         while (!mViews.empty()) {
             BView* const view = mViews.back();
@@ -238,4 +245,5 @@ class ViewStage : private ViewHost {
     BRegion mDamage;
     BRegion mDrawn;
     bool mDrawing = false;
+    bool mClosed = false;
 };

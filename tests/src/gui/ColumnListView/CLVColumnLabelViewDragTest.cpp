@@ -144,7 +144,9 @@ class WatchedHeaderTest : public HeaderGestureTest {
     // False when the condition does not come true within some seconds.
     bool Becomes(const std::function<bool()>& condition) {
         for (int i = 0; i < 1000; ++i) {
-            if (condition()) {
+            bool isTrue = false;
+            stage.Locked([&] { isTrue = condition(); });
+            if (isTrue) {
                 return true;
             }
             snooze(10000);

@@ -24,6 +24,9 @@ class NotingList : public ColumnListView {
     void ColumnWidthChanged(int32 index, float width) override {
         notes.push_back("width " + std::to_string(index) + " " + std::to_string(static_cast<int>(width)));
         ColumnListView::ColumnWidthChanged(index, width);
+        if (onWidthChanged) {
+            onWidthChanged();
+        }
     }
     void DisplayOrderChanged(const int32* order) override {
         std::string note = "order";
@@ -51,6 +54,7 @@ class NotingList : public ColumnListView {
 
     std::vector<std::string> notes;
     std::function<void()> onOrderChanged;
+    std::function<void()> onWidthChanged;
 };
 
 typedef std::vector<std::string> Notes;
@@ -65,6 +69,8 @@ class HeaderStage : public ViewStage {
           header(list->HeaderView()) {
         Add(container);
     }
+    // A watcher may still look.
+    ~HeaderStage() override { Close(); }
     // The list deletes it.
     CLVColumn* AddColumn(const char* label, float width, unsigned long flags = 0) {
         auto* const column = new CLVColumn(label, width, flags, 10);
@@ -163,7 +169,6 @@ class HeaderStage : public ViewStage {
         return notes;
     }
 
-    // Before the list, which the container owns, and the rows after it.
     std::vector<std::unique_ptr<CLVEasyItem>> rows;
     CLVContainerView* container = nullptr;
     NotingList* const list;

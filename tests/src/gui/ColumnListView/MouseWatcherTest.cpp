@@ -33,6 +33,7 @@ class WatchedView : public BView {
 class WatcherStage : public ViewStage {
   public:
     WatcherStage() : ViewStage(100, 100), view(new WatchedView(mMessages)) { Add(view); }
+    ~WatcherStage() override { Close(); }
 
     // In the view's coordinates.
     void SetMouse(float x, float y, uint32 buttons) {
