@@ -137,7 +137,7 @@ class ColumnListView : public BListView {
     bool FullListIsEmpty() const;
     // The full-list index of the first, second, .. selected row; -1 when there are fewer.
     int32 FullListCurrentSelection(int32 index = 0) const;
-    // Calls the function for each row until it answers true.
+    // Calls the function for each row until it answers true. What it adds or takes away moves the others.
     void FullListDoForEach(bool (*function)(CLVListItem* item));
     void FullListDoForEach(bool (*function)(CLVListItem* item, void* argument), void* argument);
     // Null for a row of the top level, an unknown row, or in a flat list.
@@ -198,7 +198,8 @@ class ColumnListView : public BListView {
     std::vector<CLVListItem*> AllRows() const;
 
     void SetExpanded(CLVListItem* item, bool expanded);
-    void ShowOrHideRowsBelow(const CLVListItem* item);
+    void ShowRowsBelow(const CLVListItem* item);
+    bool HideRowsBelow(const CLVListItem* item);
     CLVListItem* OnlySelectedItem() const;
     bool GoDownTheOutline();
     bool GoUpTheOutline();

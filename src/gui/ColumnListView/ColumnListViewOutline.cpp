@@ -3,6 +3,8 @@
 
 #include <InterfaceDefs.h>
 
+#include <algorithm>
+
 bool ColumnListView::AddUnder(BListItem* item, BListItem* superitem) {
     AssertWindowLocked();
     const auto* const super = dynamic_cast<const CLVListItem*>(superitem);
@@ -39,28 +41,48 @@ void ColumnListView::SetExpanded(CLVListItem* item, bool expanded) {
     if ((getsArrow || changes) && mExpanderColumn >= 0) {
         item->RedrawExpander(this);
     }
-    if (changes) {
-        ShowOrHideRowsBelow(item);
+    if (changes && expanded) {
+        ShowRowsBelow(item);
+    } else if (changes) {
+        (void)HideRowsBelow(item);
     }
 }
 
-void ColumnListView::ShowOrHideRowsBelow(const CLVListItem* item) {
+void ColumnListView::ShowRowsBelow(const CLVListItem* item) {
+    // Some are there already if the application has changed their levels. When they go, the hook for the
+    // selection may take rows away, this one among them, and collapse or expand others.
+    if (HideRowsBelow(item)) {
+        const std::vector<CLVListItem*> rows = AllRows();
+        if (std::find(rows.begin(), rows.end(), item) == rows.end() || !IsVisible(item) ||
+            !item->IsExpanded()) {
+            return;
+        }
+    }
     const int32 index = mFullList.IndexOf(item);
     const int32 end = mFullList.FindEndBelow(index, item->OutlineLevel());
     const int32 visibleIndex = mFullList.CountVisibleBefore(index) + 1;
-    // Of rows that are to be shown, some are there already if the application has changed their levels.
+    if (mFullList.CountVisibleBefore(end) > visibleIndex) {
+        return;
+    }
+    BList shown;
+    for (CLVListItem* const row : mFullList.Show(index + 1, end)) {
+        shown.AddItem(static_cast<BListItem*>(row));
+    }
+    BListView::AddList(&shown, visibleIndex);
+    UpdateDataRect(true);
+}
+
+// Whether there were any. The selection may have been among them, and its hook is called last.
+bool ColumnListView::HideRowsBelow(const CLVListItem* item) {
+    const int32 index = mFullList.IndexOf(item);
+    const int32 end = mFullList.FindEndBelow(index, item->OutlineLevel());
+    const int32 visibleIndex = mFullList.CountVisibleBefore(index) + 1;
     const int32 hidden = mFullList.Hide(index + 1, end);
     if (hidden > 0) {
         BListView::RemoveItems(visibleIndex, hidden);
+        UpdateDataRect(true);
     }
-    if (item->IsExpanded()) {
-        BList shown;
-        for (CLVListItem* const row : mFullList.Show(index + 1, end)) {
-            shown.AddItem(static_cast<BListItem*>(row));
-        }
-        BListView::AddList(&shown, visibleIndex);
-    }
-    UpdateDataRect(true);
+    return hidden > 0;
 }
 
 void ColumnListView::KeyDown(const char* bytes, int32 numBytes) {

@@ -170,16 +170,25 @@ void ColumnListView::MakeEmpty() {
 
 bool ColumnListView::DoMiscellaneous(MiscCode code, MiscData* data) {
     AssertWindowLocked();
-    if (mHierarchical || (code == B_REPLACE_OP && !CanAdd(data->replace.item)) ||
-        !BListView::DoMiscellaneous(code, data)) {
+    if (mHierarchical) {
         return false;
     }
-    int32 first = data->replace.index;
-    int32 last = first;
-    if (code != B_REPLACE_OP) {
-        first = std::min(data->swap.a, data->swap.b);
-        last = std::max(data->swap.a, data->swap.b);
+    if (code == B_REPLACE_OP) {
+        const int32 index = data->replace.index;
+        if (index < 0 || index >= mFullList.CountRows() || !CanAdd(data->replace.item)) {
+            return false;
+        }
+        mFullList.Remove(index, 1);
+        mFullList.Insert(index, static_cast<CLVListItem*>(data->replace.item), true);
+        // It comes last: it tells that the selection has changed.
+        (void)BListView::DoMiscellaneous(code, data);
+        UpdateDataRect(true);
+        return true;
     }
+    if (!BListView::DoMiscellaneous(code, data)) {
+        return false;
+    }
+    const auto [first, last] = std::minmax(data->swap.a, data->swap.b);
     std::vector<OutlineRows::NewRow> rows;
     for (int32 i = first; i <= last; ++i) {
         rows.push_back({static_cast<CLVListItem*>(ItemAt(i)), true});
@@ -240,8 +249,8 @@ int32 ColumnListView::FullListCurrentSelection(int32 index) const {
 
 void ColumnListView::FullListDoForEach(bool (*function)(CLVListItem* item)) {
     AssertWindowLocked();
-    for (CLVListItem* const item : AllRows()) {
-        if (function(item)) {
+    for (int32 i = 0; i < mFullList.CountRows(); ++i) {
+        if (function(mFullList.RowAt(i))) {
             return;
         }
     }
@@ -249,8 +258,8 @@ void ColumnListView::FullListDoForEach(bool (*function)(CLVListItem* item)) {
 
 void ColumnListView::FullListDoForEach(bool (*function)(CLVListItem* item, void* argument), void* argument) {
     AssertWindowLocked();
-    for (CLVListItem* const item : AllRows()) {
-        if (function(item, argument)) {
+    for (int32 i = 0; i < mFullList.CountRows(); ++i) {
+        if (function(mFullList.RowAt(i), argument)) {
             return;
         }
     }

@@ -54,6 +54,10 @@ void ColumnListView::UseAsSortKey(CLVColumn* column) {
     mSortKeys.AddItem(column);
     if (column->SortMode() == CLV_SORT_NONE) {
         SetSortMode(IndexOfColumn(column), CLV_SORT_ASCENDING);
+        // The hook for the sorting may have taken it away.
+        if (IndexOfColumn(column) < 0) {
+            return;
+        }
     }
     SortItems();
     InvalidateHeaderOf(column);

@@ -7,8 +7,10 @@
 #include "gui/ColumnListView/CLVContainerView.h"
 #include "gui/ColumnListView/ColumnListView.h"
 
+#include <functional>
 #include <gtest/gtest.h>
 #include <memory>
+#include <utility>
 #include <vector>
 
 // Writes down which of its hooks were called.
@@ -18,8 +20,14 @@ class TestColumnList : public ColumnListView {
                    list_view_type type = B_MULTIPLE_SELECTION_LIST)
         : ColumnListView(BRect(10, 20, 309, 219), container, "list", B_FOLLOW_ALL_SIDES,
                          B_WILL_DRAW | B_FRAME_EVENTS | B_NAVIGABLE, type, hierarchical) {}
-    void SortingChanged() override { ++sortingChanges; }
-    void SelectionChanged() override { ++selectionChanges; }
+    void SortingChanged() override {
+        ++sortingChanges;
+        CallOnce(onSortingChanged);
+    }
+    void SelectionChanged() override {
+        ++selectionChanges;
+        CallOnce(onSelectionChanged);
+    }
     void DisplayOrderChanged(const int32* order) override {
         toldOrders.emplace_back(order, order + CountColumns());
         ColumnListView::DisplayOrderChanged(order);
@@ -33,6 +41,17 @@ class TestColumnList : public ColumnListView {
     int selectionChanges = 0;
     std::vector<std::vector<int32>> toldOrders;
     std::vector<CLVSortMode> setModes;
+    // Called by the hooks, the next time alone.
+    std::function<void()> onSortingChanged;
+    std::function<void()> onSelectionChanged;
+
+  private:
+    static void CallOnce(std::function<void()>& function) {
+        const std::function<void()> called = std::exchange(function, nullptr);
+        if (called) {
+            called();
+        }
+    }
 };
 
 class ColumnLists : public ::testing::Test {
