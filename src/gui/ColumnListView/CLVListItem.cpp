@@ -91,21 +91,31 @@ void CLVListItem::DrawItem(BView* owner, BRect item_rect, bool complete) {
     }
 }
 
-void CLVListItem::DrawArrow(ColumnListView* list, BRect cell, float end) {
-    mExpanderButtonRect = kNoRect;
-    if (!mSuperItem) {
-        return;
-    }
+BRect CLVListItem::ArrowIn(BRect cell, float end) const {
     const float left = end - kArrowMargin - kArrowSide;
+    if (!mSuperItem || left > cell.right) {
+        return kNoRect;
+    }
     const float top = cell.top + std::ceil((cell.Height() - kArrowSide) / 2);
-    const float cut = std::max(0.0F, left + kArrowSide - cell.right);
-    if (left > cell.right) {
+    return BRect(left, top, std::min(left + kArrowSide, cell.right), top + kArrowSide);
+}
+
+BRect CLVListItem::ArrowFrame(ColumnListView* owner) {
+    const int32 index = owner->ExpanderColumn();
+    const BRect cell = ItemColumnFrame(index, owner);
+    return cell == kNoRect
+               ? kNoRect
+               : ArrowIn(cell, ColumnOf(owner->Columns(), index)->ColumnEnd() + ExpanderShift(index, owner));
+}
+
+void CLVListItem::DrawArrow(ColumnListView* list, BRect cell, float end) {
+    mExpanderButtonRect = ArrowIn(cell, end);
+    if (mExpanderButtonRect == kNoRect) {
         return;
     }
-    mExpanderButtonRect = BRect(left, top, left + kArrowSide - cut, top + kArrowSide);
     const BBitmap& arrow = IsExpanded() ? list->DownArrow() : list->RightArrow();
     list->SetDrawingMode(B_OP_OVER);
-    list->DrawBitmap(&arrow, BRect(0, 0, kArrowSide - cut, kArrowSide), mExpanderButtonRect);
+    list->DrawBitmap(&arrow, BRect(0, 0, mExpanderButtonRect.Width(), kArrowSide), mExpanderButtonRect);
     list->SetDrawingMode(B_OP_COPY);
 }
 

@@ -42,6 +42,8 @@ class CLVListItem : public BListItem {
     // Where the arrow, and the expander's cell, were last drawn; invalid (-1, -1, -1, -1) when they were not.
     BRect ExpanderButtonRect() const { return mExpanderButtonRect; }
     BRect ExpanderColumnRect() const { return mExpanderColumnRect; }
+    // Where the arrow is now: when columns are resized, what was drawn is moved. Invalid for none.
+    BRect ArrowFrame(ColumnListView* owner);
     // Draws the expander's cell and the arrow over it at once, where they are now. For the list.
     void RedrawExpander(ColumnListView* owner);
 
@@ -51,6 +53,7 @@ class CLVListItem : public BListItem {
 
   private:
     // `end`: where the expander's cell would end if nothing cut it off.
+    BRect ArrowIn(BRect cell, float end) const;
     void DrawArrow(ColumnListView* list, BRect cell, float end);
 
     bool mSuperItem;

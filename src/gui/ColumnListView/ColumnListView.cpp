@@ -90,9 +90,7 @@ void ColumnListView::SetFont(const BFont* font, uint32 mask) {
 void ColumnListView::MouseDown(BPoint where) {
     AssertWindowLocked();
     auto* const item = static_cast<CLVListItem*>(ItemAt(IndexOf(where)));
-    const bool onArrow = item != nullptr && item->IsSuperItem() && mExpanderColumn >= 0 &&
-                         item->ExpanderButtonRect().Contains(where);
-    if (!onArrow) {
+    if (item == nullptr || !item->ArrowFrame(this).Contains(where)) {
         BListView::MouseDown(where);
     } else if (item->IsExpanded()) {
         Collapse(item);
