@@ -6,6 +6,7 @@
 #include <Looper.h>
 #include <Message.h>
 
+#include <algorithm>
 #include <cmath>
 
 namespace {
@@ -209,8 +210,10 @@ void CLVColumnLabelView::InvalidateRightBorder(const CLVColumn* column) {
 }
 
 void CLVColumnLabelView::ResizeTo(float x) {
-    if (x != mPreviousMousePos.x) {
-        mColumnClicked->SetWidth(x - mResizeOffset - mColumnClicked->ColumnBegin());
+    const float width =
+        std::max(x - mResizeOffset - mColumnClicked->ColumnBegin(), mColumnClicked->MinWidth());
+    if (x != mPreviousMousePos.x && width != mColumnClicked->Width()) {
+        mColumnClicked->SetWidth(width);
     }
 }
 
