@@ -86,7 +86,8 @@ TEST_F(IndexerKeys, AltOpensTheMenuBarAndEscapeGivesTheKeysBack) {
 }
 
 TEST_F(IndexerKeys, TheMenusCloseIsReachedByKeysAlone) {
-    Start();
+    // The find window, which would keep the program, is not open.
+    StartWithFrame(100, 100, 450, 200);
     Press("F10");
     Press("Down");
     Press("c");
@@ -170,6 +171,8 @@ TEST_F(IndexerKeys, MinimisedAJobGoesOnAndTheWindowComesBackWithItsEnd) {
     usleep(600000);
     Desktop().tool({"windowactivate", mWindow});
     EXPECT_TRUE(Comes([] { return CountWindows() == 1; }));
+    usleep(500000);
+    KeepPicture("back-from-the-icon");
     // The bar of the first row is full.
     EXPECT_TRUE(Desktop().becomes(WindowArea().left + 200, WindowArea().top + 41, 0x404080));
     End();
