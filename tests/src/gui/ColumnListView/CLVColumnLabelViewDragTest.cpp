@@ -1,4 +1,5 @@
 #include "HeaderGestures.h"
+#include "NoNewThreads.h"
 
 #include <gtest/gtest.h>
 
@@ -168,6 +169,26 @@ TEST_F(WatchedHeaderTest, APressThatIsReleasedAtOnceIsAClick) {
     stage.MouseDown(stage.header, BPoint(120, 5));
 
     EXPECT_TRUE(Becomes([&] { return Keys() == "B+"; }));
+}
+
+TEST_F(WatchedHeaderTest, APressThatNoWatcherCanFollowIsForgotten) {
+    AddColumns();
+    const auto idle = stage.Picture();
+    for (const float x : {120.0F, 100.0F}) {
+        {
+            const NoNewThreads none;
+            stage.Press(x);
+        }
+        EXPECT_EQ(stage.Picture(), idle);
+        stage.MoveTo(10);
+        stage.Release(10);
+    }
+    EXPECT_EQ(stage.Labels(), "ABCD");
+    EXPECT_EQ(a->Width(), 100);
+    EXPECT_EQ(Keys(), "");
+
+    stage.Click(120);
+    EXPECT_EQ(Keys(), "B+");
 }
 
 TEST_F(WatchedHeaderTest, ADragIsFollowedToItsEnd) {

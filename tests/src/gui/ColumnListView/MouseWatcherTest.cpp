@@ -1,3 +1,5 @@
+#include "NoNewThreads.h"
+
 #include "gui/ColumnListView/MouseWatcher.h"
 
 #include "kits/interface/ViewStage.h"
@@ -204,6 +206,20 @@ TEST(MouseWatcher, ItEndsWhenItsViewOrLooperGoesAway) {
     WaitFor(StartMouseWatcher(&loose));
     WaitFor(StartMouseDragOrPopupWatcher(&loose));
     EXPECT_TRUE(messages.empty()) << "a view without a looper hears nothing";
+}
+
+TEST(MouseWatcher, OneThatCannotBeStartedIsRefusedAndStartsLater) {
+    WatcherStage stage;
+    stage.SetMouse(12, 5, 0);
+    for (const auto& start : {StartMouseWatcher, StartMouseDragOrPopupWatcher}) {
+        {
+            const NoNewThreads none;
+            stage.Locked([&] { EXPECT_EQ(start(stage.view), static_cast<thread_id>(B_NO_MORE_THREADS)); });
+        }
+        EXPECT_EQ(stage.Take(), Lines());
+        WaitFor(stage.Start(start));
+        EXPECT_EQ(stage.Take().size(), 1U);
+    }
 }
 
 TEST(MouseDragOrPopupWatcher, APressThatIsReleasedIsAClick) {
