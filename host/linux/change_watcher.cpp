@@ -23,6 +23,8 @@ namespace {
 constexpr std::uint32_t kEvents = IN_ATTRIB | IN_CLOSE_WRITE | IN_CREATE | IN_DELETE | IN_MOVED_FROM |
                                   IN_MOVED_TO | IN_ONLYDIR | IN_EXCL_UNLINK;
 constexpr int kDeepest = 200;
+// Milliseconds.
+constexpr int kNap = 50;
 
 } // namespace
 
@@ -100,8 +102,12 @@ void ChangeWatcher::run() {
             return;
         if (ready == 0 && limited_)
             sink_.changes_missed();
-        if (ready > 0 && !read_events())
-            sink_.changes_missed();
+        if (ready > 0) {
+            // Meanwhile the system makes one event of a file's several, and whoever changed it gets on.
+            (void)poll(waited, 1, kNap);
+            if (!stopping_ && !read_events())
+                sink_.changes_missed();
+        }
     }
 }
 

@@ -31,3 +31,7 @@ status_t sync_index(dev_t device) {
 void close_indices() {
     host::indexes().shut_down();
 }
+
+void follow_index_changes() {
+    host::indexes().follow_changes();
+}

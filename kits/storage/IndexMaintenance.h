@@ -23,6 +23,11 @@ status_t refresh_index(dev_t device, index_refresh depth);
 // Returns when every change made by this process is in the index on disk.
 status_t sync_index(dev_t device);
 
+// From now on the indices of all volumes that have one, and of those that are mounted later, take in what
+// other programs change: what happened before, in the background at idle priority, and then each change as it
+// comes. For programs with a message loop, once the indices have been made; a second call does nothing.
+void follow_index_changes();
+
 // Writes everything and ends the threads behind the indices; the next use starts them again. For the end of a
 // program.
 void close_indices();

@@ -38,7 +38,10 @@ QuirnelApp::~QuirnelApp() {
 void QuirnelApp::ReadyToRun() {
     CheckTrackerDisplayAttributes();
     CheckCreateIndices();
-    if (LoadPreferences(static_cast<BFile*>(nullptr)))
+    const bool loaded = LoadPreferences(static_cast<BFile*>(nullptr));
+    // The windows do not wait for what other programs did meanwhile.
+    follow_index_changes();
+    if (loaded)
         return;
     printf("No preferences found...\n");
     PostMessage(MSG_OPEN_INDEX_WINDOW);

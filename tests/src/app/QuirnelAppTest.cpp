@@ -8,7 +8,9 @@
 #include <Entry.h>
 #include <Message.h>
 #include <MimeType.h>
+#include <OS.h>
 #include <Path.h>
+#include <Query.h>
 #include <TypeConstants.h>
 #include <Volume.h>
 #include <VolumeRoster.h>
@@ -268,6 +270,35 @@ TEST_F(QuirnelAppTest, AColumnIsAppendedFieldByFieldInOrder) {
 TEST_F(QuirnelAppTest, TheApplicationsTypeIsInstalled) {
     EXPECT_TRUE(BMimeType("application/x-vnd.vorn-quirnel").IsInstalled());
     EXPECT_EQ(brindle_app, sApp);
+}
+
+// Half a minute at most.
+bool BecomesFindable(const std::string& predicate) {
+    for (int i = 0; i < 300; ++i) {
+        const BVolume volume(DeviceOf(TestVolumes::Instance().Music()));
+        BQuery query;
+        query.SetVolume(&volume);
+        query.SetPredicate(predicate.c_str());
+        entry_ref ref;
+        if (query.Fetch() == B_OK && query.GetNextRef(&ref) == B_OK)
+            return true;
+        snooze(100000);
+    }
+    return false;
+}
+
+TEST_F(QuirnelAppTest, TakesInWhatOtherProgramsDidBeforeItsStartAndDoAfterwards) {
+    const std::string early = MakeFile("early.mp3");
+    BVolume volume(DeviceOf(Volume()));
+    sApp->CreateIndices(&volume);
+    SetText(early, "Audio:Songname", "Tagged before the start");
+
+    CapturedOutput output;
+    sApp->ReadyToRun();
+
+    EXPECT_TRUE(BecomesFindable("Audio:Songname==\"Tagged before the start\""));
+    SetText(MakeFile("late.mp3"), "Audio:Songname", "Tagged while it runs");
+    EXPECT_TRUE(BecomesFindable("Audio:Songname==\"Tagged while it runs\""));
 }
 
 } // namespace
