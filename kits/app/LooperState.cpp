@@ -61,7 +61,10 @@ status_t LooperState::DeliverNow(std::unique_ptr<BMessage>& message) {
 void LooperState::Ring() {
     GuardLock guard(mBellMutex);
     mArrivals++;
-    if (mLooperSleeps)
+    const bool sleeps = mLooperSleeps;
+    guard.Unlock();
+    // After the mutex is free: the looper would wake only to wait for it.
+    if (sleeps)
         mArrived.notify_one();
 }
 

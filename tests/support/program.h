@@ -22,6 +22,8 @@ class Program {
     Program(const Program&) = delete;
     Program& operator=(const Program&) = delete;
 
+    /// Its process, as long as wait() and running() have not found its end.
+    int process() const { return process_; }
     void signal(int number);
     /// False once it has ended.
     bool running();
