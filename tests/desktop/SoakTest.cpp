@@ -29,6 +29,7 @@ class Soak : public Indexer {
     void UseEverything() {
         Click(kIndex);
         EXPECT_TRUE(WaitUntilTagged(kFiles));
+        WaitForButtons();
         for (const int width : {500, 800, 451})
             Resize(width, width / 2);
         Press("F10");
@@ -40,14 +41,18 @@ class Soak : public Indexer {
         MakeFile("passing/Artist - Passing.mp3");
         Click(kStrip);
         EXPECT_TRUE(WaitUntilTagged(0));
+        WaitForButtons();
         std::filesystem::remove_all(Volume() + "/passing");
         Click(kIndex);
         usleep(100000);
         Click(kStop);
-        usleep(500000);
+        WaitForButtons();
         Click(kStrip);
         EXPECT_TRUE(WaitUntilTagged(0));
+        WaitForButtons();
     }
+    // A job's end is seen, and the buttons follow, with the next pulse.
+    static void WaitForButtons() { usleep(1000000); }
 };
 
 TEST_F(Soak, MemoryDoesNotGrow) {
