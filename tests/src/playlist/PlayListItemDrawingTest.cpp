@@ -139,6 +139,12 @@ TEST_F(SongRow, ClearsItsBackgroundWhenSelectedOrDrawnAsAWhole) {
     }
 }
 
+TEST_F(SongRow, WithoutACoverTheFirstColumnIsEmpty) {
+    Draw(0, true);
+    EXPECT_TRUE(mPicture.IsAll(kWhite, kCell));
+    EXPECT_TRUE(mPicture.IsRedOutside(kCell));
+}
+
 TEST_F(SongRow, TheSmallCoverStandsTwoPixelsFromTheCellsCorner) {
     SetSmallCover(MakeCover(15, {0, 0, 255, 255}));
     Draw(0, true);
@@ -180,6 +186,24 @@ TEST_F(SongRow, ALargeCoverAloneFillsTheCell) {
     Draw(0, true);
     EXPECT_TRUE(mPicture.IsAll(kGreen, kCell));
     EXPECT_TRUE(mPicture.IsRedOutside(kCell));
+}
+
+TEST_F(SongRow, OfALargeCoverAloneNothingIsCutOff) {
+    auto cover = MakeCover(63, {0, 255, 0, 255});
+    cover->Lock();
+    BView* const view = cover->ChildAt(0);
+    view->SetHighColor(0, 0, 255);
+    view->FillRect(BRect(32, 32, 63, 63));
+    view->Sync();
+    cover->Unlock();
+    SetLargeCover(std::move(cover));
+    const BRect cell(10, 5, 29, 24);
+    Draw(0, true, cell);
+    // Its lower right quarter is that of the cell, but for where the two colours meet.
+    EXPECT_TRUE(mPicture.IsAll(kGreen, BRect(10, 5, 29, 13)));
+    EXPECT_TRUE(mPicture.IsAll(kGreen, BRect(10, 5, 18, 24)));
+    EXPECT_TRUE(mPicture.IsAll(kBlue, BRect(21, 16, 29, 24)));
+    EXPECT_TRUE(mPicture.IsRedOutside(cell));
 }
 
 TEST_F(SongRow, ALargeCoverIsDrawnOverTheSmallOne) {
