@@ -179,6 +179,19 @@ TEST_F(PlayListDrop, WhatLeavesForGoodIsNot) {
     EXPECT_EQ(Rows(), Names{});
 }
 
+TEST_F(PlayListDrop, WhatLeavesByTheMarginIsStillTakenInWhereThePointerReturns) {
+    const auto files = FilesOf({mSong});
+    Enter(files);
+    Move(files, BPoint(0, 120));
+    Leave();
+    EXPECT_FALSE(AntsShow());
+    MoveWithoutDrag(kIn);
+    EXPECT_TRUE(AntsShow());
+    Release(InList(kIn));
+    EXPECT_FALSE(AntsShow());
+    EXPECT_EQ(Rows(), Names{"song.mp3"});
+}
+
 TEST_F(PlayListDrop, WithoutFilesNothingHappens) {
     Enter(TextOnly());
     EXPECT_FALSE(AntsShow());
