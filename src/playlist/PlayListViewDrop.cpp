@@ -46,6 +46,7 @@ void PlayListView::MouseMoved(BPoint where, uint32 transit, const BMessage* drag
         }
         break;
     case B_EXITED_VIEW:
+        // What leaves by the margin, where they do not show, stays accepted; meant so.
         if (mAntsVisible) {
             mAntsCleared = true;
             HideAnts();
