@@ -57,6 +57,8 @@ void PlayListView::ShowFolderMenu(PlayListItem* item, BPoint where) {
 }
 
 void PlayListView::SelectAndDrag(BPoint where) {
+    if (!IsFocus())
+        MakeFocus();
     const bool wasActive = Window()->IsActive();
     uint32 buttons = B_PRIMARY_MOUSE_BUTTON;
     do {

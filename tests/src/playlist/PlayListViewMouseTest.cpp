@@ -61,6 +61,15 @@ TEST_F(PlayListMouse, APressSelectsByWhereItIsAndWhichKeysAreHeld) {
     EXPECT_EQ(Dragged(), Names{"no drag"});
 }
 
+TEST_F(PlayListMouse, APressOnARowGivesTheListTheKeyboard) {
+    Locked([&] {
+        mList->MakeFocus(false);
+        return 0;
+    });
+    Click(Place(2));
+    EXPECT_TRUE(Locked([&] { return mList->IsFocus(); }));
+}
+
 TEST_F(PlayListMouse, TheHeldButtonWorksOnEachRowThatItComesTo) {
     const struct {
         const char* what;
