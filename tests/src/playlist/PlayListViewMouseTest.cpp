@@ -149,6 +149,17 @@ TEST_F(PlayListMouse, NothingIsDraggedWithKeysHeld) {
     }
 }
 
+TEST_F(PlayListMouse, ASelectedRowIsDraggedWithShiftHeldToo) {
+    Select({2, 5});
+    LiveInput().modifiers_are(kShift);
+    Press(On(2));
+    HoldTo(On(4));
+    Settle();
+    EXPECT_EQ(Dragged(), (Names{"2.mp3", "5.mp3"}));
+    Release(On(4));
+    EXPECT_EQ(Selection(), (Numbers{2, 5}));
+}
+
 TEST_F(PlayListMouse, FilesThatHaveGoneAreDraggedAllTheSame) {
     std::filesystem::remove(Volume() + "/2.mp3");
     Press(On(2));
