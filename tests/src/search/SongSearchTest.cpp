@@ -4,7 +4,11 @@
 #include "indexing/FileIndexListItem.h"
 #include "indexing/VolumeJobs.h"
 #include "metadata/BrindleMetaData.h"
+#include "search/SongQuery.h"
 #include "support/captured_output.h"
+
+#include <Query.h>
+#include <String.h>
 
 #include <algorithm>
 
@@ -25,6 +29,15 @@ TEST_F(SongSearch, LooksIntoSongArtistAlbumAndNumberAndNothingElse) {
     Names found = Find("Needle");
     std::sort(found.begin(), found.end());
     EXPECT_EQ(found, (Names{"1.mp3", "2.mp3", "3.mp3", "4.mp3"}));
+}
+
+TEST_F(SongSearch, AsksForSongArtistAlbumAndNumberInThisOrder) {
+    BQuery query;
+    PushSongsContaining(query, "a*b");
+    BString condition;
+    ASSERT_EQ(query.GetPredicate(&condition), B_OK);
+    EXPECT_STREQ(condition.String(), "((Audio:Songname==\"*a\\*b*\")||((Audio:Artist==\"*a\\*b*\")||"
+                                     "((Audio:Album==\"*a\\*b*\")||(Audio:TrackNo==\"*a\\*b*\"))))");
 }
 
 TEST_F(SongSearch, ASongIsListedOnceThoughAllOfItMatches) {
