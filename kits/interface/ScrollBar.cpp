@@ -126,8 +126,9 @@ void BScrollBar::TargetScrolledTo(float value) {
 void BScrollBar::SetProportion(float proportion) {
     proportion = std::max(0.0F, proportion);
     if (proportion != mLayout.proportion) {
+        const ScrollBarLayout before = CurrentLayout();
         mLayout.proportion = proportion;
-        Invalidate();
+        InvalidateUnlessItLooksLike(before);
     }
 }
 
@@ -137,10 +138,18 @@ void BScrollBar::SetRange(float min, float max) {
     if (min > max || (min == mLayout.min && max == mLayout.max)) {
         return;
     }
+    const ScrollBarLayout before = CurrentLayout();
     mLayout.min = min;
     mLayout.max = max;
-    Invalidate();
+    InvalidateUnlessItLooksLike(before);
     SetValue(mLayout.value);
+}
+
+// A list that grows changes its bar with each row, and seldom by a pixel.
+void BScrollBar::InvalidateUnlessItLooksLike(const ScrollBarLayout& before) {
+    if (!CurrentLayout().LooksLike(before)) {
+        Invalidate();
+    }
 }
 
 void BScrollBar::GetRange(float* min, float* max) const {

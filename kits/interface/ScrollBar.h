@@ -68,6 +68,7 @@ class BScrollBar : public BView {
     void ForgetTarget() { mTarget = nullptr; }
 
     ScrollBarLayout CurrentLayout() const;
+    void InvalidateUnlessItLooksLike(const ScrollBarLayout& before);
     float AlongBar(BPoint point) const { return mOrientation == B_HORIZONTAL ? point.x : point.y; }
     BRect PartRect(int32 start, int32 length) const;
     void DrawButton(BRect rect, bool isMore);

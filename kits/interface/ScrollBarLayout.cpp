@@ -64,3 +64,8 @@ ScrollBarLayout::Part ScrollBarLayout::PartAt(int32 position) const {
     }
     return position < ThumbStart() + ThumbLength() ? Part::Thumb : Part::TroughBehind;
 }
+
+bool ScrollBarLayout::LooksLike(const ScrollBarLayout& other) const {
+    return length == other.length && breadth == other.breadth && CanScroll() == other.CanScroll() &&
+           ThumbStart() == other.ThumbStart() && ThumbLength() == other.ThumbLength();
+}

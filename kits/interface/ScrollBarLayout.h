@@ -26,4 +26,6 @@ struct ScrollBarLayout {
     // The whole value at which the thumb would begin there.
     float ValueForThumbAt(int32 start) const;
     Part PartAt(int32 position) const;
+    // No part of it is drawn otherwise.
+    bool LooksLike(const ScrollBarLayout& other) const;
 };

@@ -10,6 +10,30 @@ namespace {
 
 typedef ScrollBarLayout::Part Part;
 
+TEST(ScrollBarLayout, LooksLikeAnotherAsLongAsNoPixelDiffers) {
+    ScrollBarLayout bar;
+    bar.length = 230;
+    bar.breadth = 15;
+    bar.max = 100000;
+    bar.proportion = 0.002F;
+    ScrollBarLayout other = bar;
+    other.max = 100021;
+    other.proportion = 0.0019F;
+    EXPECT_TRUE(bar.LooksLike(other));
+    other = bar;
+    other.value = 50000;
+    EXPECT_FALSE(bar.LooksLike(other)) << "the thumb is elsewhere";
+    other = bar;
+    other.proportion = 0.5F;
+    EXPECT_FALSE(bar.LooksLike(other)) << "the thumb is longer";
+    other = bar;
+    other.max = 0;
+    EXPECT_FALSE(bar.LooksLike(other)) << "it cannot scroll";
+    other = bar;
+    other.length = 231;
+    EXPECT_FALSE(bar.LooksLike(other));
+}
+
 TEST(ScrollBarLayout, TheThumbTakesItsShareOfTheTrough) {
     ScrollBarLayout layout{
         .length = 130, .breadth = 15, .min = 0, .max = 300, .value = 0, .proportion = 0.25F};
