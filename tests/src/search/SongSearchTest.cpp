@@ -9,6 +9,7 @@
 
 #include <Query.h>
 #include <String.h>
+#include <TextView.h>
 
 #include <algorithm>
 
@@ -126,6 +127,43 @@ TEST_F(SongSearch, TheFieldsTextIsSearchedForWhenTheMessageComes) {
     WithWindow([&] { Field()->SetText("One"); });
     EXPECT_EQ(Rows(), Names{}) << "not as one types";
     Post(BMessage(700));
+    EXPECT_EQ(Rows(), Names{"1.mp3"});
+}
+
+TEST_F(SongSearch, ReturnOrLeavingTheChangedFieldSearches) {
+    MakeSong("1.mp3", "One");
+    MakeSong("2.mp3", "Two");
+    Open();
+    const auto type = [&](const std::string& keys) {
+        WithWindow([&] {
+            for (const char key : keys)
+                Field()->TextView()->KeyDown(&key, 1);
+        });
+        Settle();
+    };
+    type("One");
+    EXPECT_EQ(Rows(), Names{}) << "not as one types";
+    type("\n");
+    EXPECT_EQ(Rows(), Names{"1.mp3"});
+    // Return has selected the text, which is typed over.
+    type("Two");
+    EXPECT_EQ(Rows(), Names{"1.mp3"});
+    WithWindow([&] { mWindow->List()->MakeFocus(); });
+    Settle();
+    EXPECT_EQ(Rows(), Names{"2.mp3"});
+}
+
+TEST_F(SongSearch, LeavingAnUnchangedFieldSearchesNothing) {
+    MakeSong("1.mp3", "One");
+    Open();
+    ASSERT_EQ(Find("One"), Names{"1.mp3"});
+    WithWindow([&] { mWindow->List()->MakeFocus(); });
+    Settle();
+    EXPECT_EQ(Rows(), Names{"1.mp3"}) << "the empty text is not searched for";
+    MakeSong("2.mp3", "One too");
+    WithWindow([&] { Field()->MakeFocus(); });
+    WithWindow([&] { mWindow->List()->MakeFocus(); });
+    Settle();
     EXPECT_EQ(Rows(), Names{"1.mp3"});
 }
 
