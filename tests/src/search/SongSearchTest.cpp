@@ -224,6 +224,7 @@ TEST_F(SongSearch, AVolumeThatComesLaterIsSearchedByTheNextWindow) {
     mApp->FindWindowSlot().Close();
     Open();
     EXPECT_EQ(Find("Here"), (Names{"1.mp3", "later.mp3"}));
+    std::filesystem::remove(passing + "/later.mp3");
 }
 
 TEST_F(SongSearch, WorksWhileAJobTagsTheSameVolume) {
