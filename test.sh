@@ -49,7 +49,7 @@ run_dev() {
 # The programs whose code runs in several threads.
 threaded=(test_kits_support test_kits_kernel test_kits_app test_kits_interface test_kits_interface_windows test_host_linux test_host_threads
           test_host_sqlite test_indexing test_closing_races test_kits_app_races test_kits_kernel_races test_index_write_fault test_kits_app_processes
-          test_host_transport test_column_list_columns)
+          test_host_transport test_column_list_columns test_soundplay_scripter test_soundplay_alone)
 
 run_tsan() {
     configure_and_build tsan --target "${threaded[@]}" || return 1
