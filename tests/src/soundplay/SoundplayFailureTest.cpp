@@ -184,6 +184,20 @@ TEST_F(SoundplayScripterTest, AnAnswerWithoutMessengerLeavesALayerThatNothingRea
     EXPECT_EQ(Log(), log);
 }
 
+TEST_F(SoundplayScripterTest, ALayerThatEndsBeforeItsTrackIsSaidAndStaysInTheList) {
+    mEnvironment.set("TEST_PLAYER_MODE", "gone");
+    const auto player = StartPlayer();
+    SoundplayScripter scripter;
+    sptrackinfo* layer = nullptr;
+    EXPECT_EQ(Printed([&] { layer = scripter.NewLayer(&mSong, nullptr); }),
+              "GetValues:\nerror sending opentrack\n");
+    ASSERT_NE(layer, nullptr);
+    const std::string log = "ready\n" + NewLayerLine(*layer);
+    EXPECT_EQ(Printed([&] { scripter.RepitchLayer(layer, 2); }), "");
+    EXPECT_EQ(Printed([&] { scripter.DeleteLayer(layer); }), "");
+    EXPECT_EQ(Log(), log);
+}
+
 TEST_F(SoundplayScripterTest, APlayerThatDiesIsNotNoticedButByTheTrack) {
     const auto player = StartPlayer();
     SoundplayScripter scripter;

@@ -1,6 +1,7 @@
 // A stand-in for the player. What it is sent becomes lines in the file that TEST_PLAYER_LOG names: who got it
 // ("player" or "layer"), the code in hexadecimal, the fields in their order.
-// TEST_PLAYER_MODE: "answers" with a messenger, "nameless" without one, "silent" not at all.
+// TEST_PLAYER_MODE: "answers" with a messenger, "gone" with one of a layer that has ended, "nameless" without
+// one, "silent" not at all.
 #include <Application.h>
 #include <Messenger.h>
 #include <OS.h>
@@ -89,10 +90,12 @@ class Player : public BApplication {
         }
         BMessage reply(B_REPLY);
         reply.AddString("something", "else");
-        if (mode == "answers") {
+        if (mode == "answers" || mode == "gone") {
             auto* const layer = new Layer;
             layer->Run();
             reply.AddMessenger("messenger", BMessenger(layer));
+            if (mode == "gone" && layer->Lock())
+                layer->Quit();
         }
         message->SendReply(&reply);
     }
