@@ -37,12 +37,7 @@ void PlayListItem::GetRef(entry_ref* out) const {
 
 void PlayListItem::Update(BView* owner, const BFont* font) {
     CLVListItem::Update(owner, font);
-    // Whatever font the list has.
-    font_height height;
-    be_plain_font->GetHeight(&height);
-    const float ascent = std::ceil(height.ascent);
-    const float descent = std::ceil(height.descent);
-    mTextOffset = (Height() - (ascent + descent)) / 2 + ascent;
+    mTextOffset = CenteredBaseline();
 }
 
 void PlayListItem::DrawItemColumn(BView* owner, BRect columnRect, int32 columnIndex, bool complete) {

@@ -175,12 +175,7 @@ const BBitmap* CLVEasyItem::GetColumnContentBitmap(int column_index) const {
 
 void CLVEasyItem::Update(BView* owner, const BFont* font) {
     CLVListItem::Update(owner, font);
-    // The system's plain font, whatever the list's, as texts are shortened by it too.
-    font_height height;
-    be_plain_font->GetHeight(&height);
-    const float ascent = std::ceil(height.ascent);
-    const float descent = std::ceil(height.descent);
-    mTextOffset = ascent + (Height() - (ascent + descent)) / 2;
+    mTextOffset = CenteredBaseline();
 }
 
 void CLVEasyItem::DrawItemColumn(BView* owner, BRect column_rect, int32 column_index, bool complete) {

@@ -6,6 +6,8 @@
 #include "gui/ColumnListView/OutlineRows.h"
 #include "widgets/PrefilledBitmap.h"
 
+#include <Font.h>
+
 #include <algorithm>
 #include <cmath>
 
@@ -135,6 +137,14 @@ void CLVListItem::Update(BView* owner, const BFont* font) {
     if (Height() < mMinHeight) {
         SetHeight(mMinHeight);
     }
+}
+
+float CLVListItem::CenteredBaseline() const {
+    font_height height;
+    be_plain_font->GetHeight(&height);
+    const float ascent = std::ceil(height.ascent);
+    const float descent = std::ceil(height.descent);
+    return ascent + (Height() - (ascent + descent)) / 2;
 }
 
 void CLVListItem::ColumnWidthChanged(int32 /*column_index*/, float /*column_width*/,

@@ -51,6 +51,11 @@ class CLVListItem : public BListItem {
     OutlinePlace& PlaceInOutline() { return mPlace; }
     const OutlinePlace& PlaceInOutline() const { return mPlace; }
 
+  protected:
+    // From the row's top to the baseline of a text in the middle of its height, in the system's plain font,
+    // whatever the list's.
+    float CenteredBaseline() const;
+
   private:
     // `end`: where the expander's cell would end if nothing cut it off.
     BRect ArrowIn(BRect cell, float end) const;
