@@ -127,10 +127,12 @@ void Layer::Play(const entry_ref& ref) {
 }
 
 void Layer::Look() {
-    if (HasEnded() || !mError.empty())
-        return;
-    const host::PlayerValues values = mPlayer->values();
-    if (values.state == host::PlayerState::failed)
+    if (!HasEnded())
+        LookAt(mPlayer->values());
+}
+
+void Layer::LookAt(const host::PlayerValues& values) {
+    if (mError.empty() && values.state == host::PlayerState::failed)
         Fail(TextOf(values.failure));
 }
 
@@ -151,8 +153,9 @@ std::string Layer::Name() const {
 }
 
 void Layer::AddValues(BMessage* reply) {
-    Look();
     const host::PlayerValues values = mPlayer->values();
+    // What the reply says has been said here.
+    LookAt(values);
     reply->AddInt32("layer", mNumber);
     reply->AddString("name", mName.c_str());
     reply->AddString("path", mPath.c_str());

@@ -29,6 +29,7 @@ class Layer : public BHandler {
     void AddValues(BMessage* reply);
 
   private:
+    void LookAt(const host::PlayerValues& values);
     // B_OK, or the status of what was refused.
     status_t SetValues(const BMessage& message);
     void Play(const entry_ref& ref);
