@@ -45,7 +45,8 @@ void ChangeWatcher::say_limit_once() {
     limited_ = true;
     if (!said.exchange(true))
         std::fprintf(stderr,
-                     "The system's limit of watched directories (fs.inotify.max_user_watches) is reached: "
+                     "The system's limit of watched directories (fs.inotify.max_user_watches) or watchers "
+                     "(fs.inotify.max_user_instances) is reached: "
                      "changes by other programs are looked for every ten minutes.\n");
 }
 

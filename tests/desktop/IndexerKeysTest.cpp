@@ -156,7 +156,13 @@ TEST_F(IndexerKeys, TwoHundredVolumesAreListed) {
     Press("Tab");
     Press("space");
     EXPECT_TRUE(WaitUntilTagged(1));
-    End();
+    mProgram->signal(SIGTERM);
+    const test::ProgramResult result = mProgram->wait();
+    EXPECT_EQ(result.status, 0) << "signal " << result.signal;
+    // Each volume is watched by itself, and many systems allow 128 watchers.
+    EXPECT_TRUE(result.errors.empty() ||
+                result.errors.starts_with("The system's limit of watched directories"))
+        << result.errors;
 }
 
 TEST_F(IndexerKeys, MinimisedAJobGoesOnAndTheWindowComesBackWithItsEnd) {

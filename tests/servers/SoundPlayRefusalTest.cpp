@@ -97,7 +97,7 @@ TEST_F(SoundPlayTest, LayersOfAProcessThatIsKilledEndAndThoseOfOthersPlayOn) {
     EXPECT_TRUE(Eventually([&] { return !ValuesOf(application).HasInt32("layer", 1); }));
     EXPECT_TRUE(ValuesOf(application).HasInt32("layer", 0));
     EXPECT_TRUE(layer->messenger->IsValid());
-    EXPECT_EQ(StateOf(layer), "playing");
+    EXPECT_TRUE(Becomes(layer, "playing"));
 }
 
 TEST_F(SoundPlayTest, MessagesThatMeanNothingAreAnsweredSoAndChangeNothing) {
