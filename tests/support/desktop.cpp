@@ -87,6 +87,9 @@ Desktop::Desktop(WindowManager manager) {
     setenv("DISPLAY", display_.c_str(), 1);
     unsetenv("WAYLAND_DISPLAY");
     unsetenv("QT_QPA_PLATFORM");
+    // Where there is no session bus, looking for one would start one: by a fork in the middle of a program of
+    // many threads, which a sanitizer does not always survive.
+    setenv("DBUS_SESSION_BUS_ADDRESS", "disabled:", 0);
     if (manager == WindowManager::openbox) {
         manager_ = start({"openbox"});
         // It tells the root window when it is there.
