@@ -131,7 +131,7 @@ double RunJobInWindow(std::size_t tracks) {
     return rate;
 }
 
-/// From the start of the program to its list on the screen.
+/// From the start of the program to the lists of both windows on the screen.
 double SecondsToWindow(bench::WindowWatch& display) {
     const bench::Stopwatch watch;
     const pid_t program = fork();
@@ -139,12 +139,12 @@ double SecondsToWindow(bench::WindowWatch& display) {
         execl(QUIRNEL_PROGRAM, QUIRNEL_PROGRAM, nullptr);
         _exit(1);
     }
-    const bool shown = display.WaitForWindow("Indexer", 20.0);
+    const bool shown = display.WaitForWindow("Indexer", 20.0) && display.WaitForWindow("Find song", 20.0);
     const double seconds = watch.Seconds();
     kill(program, SIGTERM);
     waitpid(program, nullptr, 0);
     if (!shown)
-        Fail("the window does not come");
+        Fail("the windows do not come");
     return seconds;
 }
 
@@ -191,7 +191,7 @@ int main(int argc, char** argv) {
 
     using bench::Better;
     bool reached =
-        bench::Report("start to the window on the screen", bench::Median(times), "ms",
+        bench::Report("start to both windows on the screen", bench::Median(times), "ms",
                       "limit, " + std::to_string(tracks) + " tracks indexed", 400, 1.0, Better::lower);
     reached &= bench::Report("slowest start", *std::max_element(times.begin(), times.end()), "ms", "limit",
                              400, 1.0, Better::lower);

@@ -89,7 +89,7 @@ bool WindowWatch::IsShown(const std::string& title) const {
         const auto pixel = Owned(
             xcb_get_image_reply(mConnection,
                                 xcb_get_image(mConnection, XCB_IMAGE_FORMAT_Z_PIXMAP, window,
-                                              static_cast<std::int16_t>(place->width / 2),
+                                              static_cast<std::int16_t>(place->width / 8),
                                               static_cast<std::int16_t>(place->height * 3 / 5), 1, 1, ~0U),
                                 nullptr));
         if (pixel && xcb_get_image_data_length(pixel.get()) >= 4 &&

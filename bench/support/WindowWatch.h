@@ -16,8 +16,8 @@ class WindowWatch {
     WindowWatch(const WindowWatch&) = delete;
     WindowWatch& operator=(const WindowWatch&) = delete;
 
-    /// Waits until a window of that title is on the screen with a white list in its middle. False when it is
-    /// not in time. Looks a thousand times a second.
+    /// Waits until a window of that title is on the screen with a white list at its left side. False when it
+    /// is not in time. Looks a thousand times a second.
     bool WaitForWindow(const std::string& title, double seconds);
 
   private:
