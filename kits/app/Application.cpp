@@ -250,7 +250,9 @@ void BApplication::DispatchMessage(BMessage* message, BHandler* handler) {
         AboutRequested();
         break;
     case B_PULSE:
-        Pulse();
+        // One that was on its way when the rate was set to none.
+        if (mPulseRate > 0)
+            Pulse();
         break;
     case _ACTIVATE_APP_:
         // Windows tell by themselves when they have got the focus.

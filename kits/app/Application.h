@@ -55,7 +55,7 @@ class BApplication : public BLooper {
     // by another (BRoster::ActivateApp()) or started again.
     virtual void AppActivated(bool active);
     virtual void AboutRequested();
-    // Every SetPulseRate() microseconds; 0, as at first, for never.
+    // Every SetPulseRate() microseconds; 0, as at first, for never, also for a pulse that waits in the queue.
     virtual void Pulse();
     void SetPulseRate(bigtime_t rate);
 

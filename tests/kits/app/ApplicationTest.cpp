@@ -219,11 +219,12 @@ TEST_F(ApplicationTest, PulseComesAgainAndAgainUntilTheEnd) {
     EXPECT_GE(std::count(application.calls.begin(), application.calls.end(), "pulse"), 3);
 }
 
-TEST_F(ApplicationTest, WithoutAPulseRateThereIsNoPulse) {
+TEST_F(ApplicationTest, WithoutAPulseRateThereIsNoPulseAlsoNoneThatWaited) {
     TestApplication application;
     application.SetPulseRate(1000);
+    while (application.MessageQueue()->FindMessage(uint32{B_PULSE}) == nullptr)
+        snooze(100);
     application.SetPulseRate(0);
-    snooze(10000);
     application.PostMessage('quit');
     application.Run();
     EXPECT_EQ(std::count(application.calls.begin(), application.calls.end(), "pulse"), 0);
