@@ -348,7 +348,10 @@ void expect_display();
 // before. May be called again after it has returned.
 void run_display();
 void end_display_loop();
-// Called on the main thread when the desktop's session asks the program to end.
+// Both are called on the main thread. The session asks for what must outlive the program to be saved, because
+// it may end now: or go on, when it is only saved as a whole or the user thinks better of it.
+void set_save_handler(std::function<void()> handler);
+// The session ends, and the program with it.
 void set_quit_handler(std::function<void()> handler);
 // Called on the main thread, in the middle of run_display(), when the display has gone: its server has ended,
 // or a window manager has cut the program off. The process ends with a line on standard error and exit status

@@ -22,6 +22,11 @@ namespace {
 
 std::atomic<bool> connected{false};
 std::atomic<bool> loop_to_end{false};
+std::function<void()>& save_handler() {
+    static std::function<void()> handler;
+    return handler;
+}
+
 std::function<void()>& quit_handler() {
     static auto* const handler = new std::function<void()>;
     return *handler;
@@ -76,10 +81,27 @@ void watch_for_loss(QtMsgType type, const QMessageLogContext& context, const QSt
     std::_Exit(EXIT_FAILURE);
 }
 
-void serve_session() {
-    QObject::connect(qApp, &QGuiApplication::commitDataRequest, qApp, [](QSessionManager& /*session*/) {
+// What the session's end is made into; left alone, it would close the windows one by one and end the loop.
+class EndOfSession : public QObject {
+  public:
+    using QObject::QObject;
+    bool eventFilter(QObject* object, QEvent* event) override {
+        if (object != qApp || event->type() != QEvent::Quit) {
+            return QObject::eventFilter(object, event);
+        }
         if (quit_handler()) {
             quit_handler()();
+        }
+        event->accept();
+        return true;
+    }
+};
+
+void serve_session() {
+    qApp->installEventFilter(new EndOfSession(qApp));
+    QObject::connect(qApp, &QGuiApplication::commitDataRequest, qApp, [](QSessionManager& /*session*/) {
+        if (save_handler()) {
+            save_handler()();
         }
     });
     // The session restarts what the user starts; a copy that it makes by itself would be a second one.
@@ -136,6 +158,10 @@ void end_display_loop() {
             QCoreApplication::exit(0);
         }
     });
+}
+
+void set_save_handler(std::function<void()> handler) {
+    save_handler() = std::move(handler);
 }
 
 void set_quit_handler(std::function<void()> handler) {

@@ -46,6 +46,8 @@ enum : uint32 {
     // Sent to an application whose windows are to come to the front; "token" (string) is the desktop's token
     // for that, when there is one.
     _ACTIVATE_APP_ = '_AAP',
+    // Sent to an application when the desktop's session may be about to end.
+    _SAVE_STATE_ = '_SST',
     // Sent to a view that something was dropped on.
     _MESSAGE_DROPPED_ = '_MDP',
 

@@ -194,6 +194,7 @@ void BApplication::AppActivated(bool) {}
 
 void BApplication::AboutRequested() {}
 
+void BApplication::SaveStateRequested() {}
 void BApplication::Pulse() {}
 
 void BApplication::SetPulseRate(bigtime_t rate) {
@@ -253,6 +254,9 @@ void BApplication::DispatchMessage(BMessage* message, BHandler* handler) {
         // One that was on its way when the rate was set to none.
         if (mPulseRate > 0)
             Pulse();
+        break;
+    case _SAVE_STATE_:
+        SaveStateRequested();
         break;
     case _ACTIVATE_APP_:
         // Windows tell by themselves when they have got the focus.

@@ -55,6 +55,9 @@ class BApplication : public BLooper {
     // by another (BRoster::ActivateApp()) or started again.
     virtual void AppActivated(bool active);
     virtual void AboutRequested();
+    // The desktop's session may be about to end: what is to outlive the program belongs on disk now. A
+    // session that does end asks with B_QUIT_REQUESTED as well; one that goes on lets the program run on.
+    virtual void SaveStateRequested();
     // Every SetPulseRate() microseconds; 0, as at first, for never, also for a pulse that waits in the queue.
     virtual void Pulse();
     void SetPulseRate(bigtime_t rate);

@@ -66,6 +66,7 @@ bool WindowLoop::Prepare() {
         std::fprintf(stderr, "%s\n", problem.c_str());
         return false;
     }
+    host::set_save_handler([] { be_app_messenger.SendMessage(_SAVE_STATE_); });
     host::set_quit_handler([] { be_app_messenger.SendMessage(B_QUIT_REQUESTED); });
     host::set_loss_handler([this] { EndApplication(); });
     GuardLock guard(mMutex);

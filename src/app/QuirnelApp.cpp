@@ -111,6 +111,10 @@ bool QuirnelApp::QuitRequested() {
     return true;
 }
 
+void QuirnelApp::SaveStateRequested() {
+    SavePreferences(static_cast<BFile*>(nullptr));
+}
+
 void QuirnelApp::MaybeQuit() {
     // The playlist window does not keep the program.
     if (mFindWindow.IsEmpty() && mIndexWindow.IsEmpty())

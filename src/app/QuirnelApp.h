@@ -37,6 +37,8 @@ class QuirnelApp : public BApplication {
     void MessageReceived(BMessage* message) override;
     // Saves the settings, then closes the main windows without asking them.
     bool QuitRequested() override;
+    // Saves the settings, for a session that may end before the program is asked to.
+    void SaveStateRequested() override;
     // Shows the about box and waits until it is closed.
     void AboutRequested() override;
 

@@ -42,6 +42,7 @@ class TestApplication : public BApplication {
     }
     void AppActivated(bool active) override { Note(active ? "active" : "inactive"); }
     void AboutRequested() override { Note("about"); }
+    void SaveStateRequested() override { Note("save"); }
     void Pulse() override {
         Note("pulse");
         if (std::count(calls.begin(), calls.end(), "pulse") == 3)
@@ -207,9 +208,11 @@ TEST_F(ApplicationTest, SystemMessagesCallTheirHooks) {
     activated.AddBool("active", true);
     application.PostMessage(&activated);
     application.PostMessage(B_ABOUT_REQUESTED);
+    application.PostMessage(_SAVE_STATE_);
     application.PostMessage('quit');
     application.Run();
-    EXPECT_EQ(application.calls, (Calls{"ready", "program", "file", "refs", "active", "about", "quit"}));
+    EXPECT_EQ(application.calls,
+              (Calls{"ready", "program", "file", "refs", "active", "about", "save", "quit"}));
 }
 
 TEST_F(ApplicationTest, PulseComesAgainAndAgainUntilTheEnd) {
