@@ -53,7 +53,7 @@ DirectoryCache& DirectoryCache::instance() {
 }
 
 DirectoryCache::DirectoryCache(std::size_t open_limit, std::size_t hint_limit)
-    : open_limit_(std::max<std::size_t>(open_limit, 1)), hint_limit_(std::max<std::size_t>(hint_limit, 1)) {}
+    : open_limit_(std::max<std::size_t>(open_limit, 1)), hint_limit_(std::max<std::size_t>(hint_limit, 2)) {}
 
 DirectoryCache::~DirectoryCache() {
     MutexLock lock(mutex_);
@@ -131,10 +131,10 @@ Result<DirectoryCache::Handle> DirectoryCache::find_by_hint(const Key& key, int 
     Hint hint;
     {
         MutexLock lock(mutex_);
-        const auto found = hints_.find(key);
-        if (found == hints_.end())
+        const Hint* const found = find_hint(key);
+        if (found == nullptr)
             return Status(ENOENT);
-        hint = found->second;
+        hint = *found;
     }
     // Wrong hints may form a ring.
     if (depth >= kDeepestHint)
@@ -154,10 +154,10 @@ Result<DirectoryCache::Handle> DirectoryCache::find_in_hinted_parent(const Key& 
     std::uint64_t parent_inode = 0;
     {
         MutexLock lock(mutex_);
-        const auto hint = hints_.find(key);
-        if (hint == hints_.end())
+        const Hint* const hint = find_hint(key);
+        if (hint == nullptr)
             return Status(ENOENT);
-        parent_inode = hint->second.parent;
+        parent_inode = hint->parent;
     }
     const Key parent_key{key.device, parent_inode};
     Handle parent = find_open(parent_key);
@@ -203,6 +203,7 @@ Result<DirectoryCache::Handle> DirectoryCache::search_volume(const Key& key) {
         for (DirectoryStream::Entry entry; stream.next(entry);) {
             if ((entry.type != DT_DIR && entry.type != DT_UNKNOWN) || entry.leaf == kBlobDirectoryName)
                 continue;
+            remember(key.device, entry.inode, status.st_ino, std::string(entry.leaf));
             if (entry.inode == key.inode) {
                 Result<Handle> found = open_wanted(key, directory->get(), entry.leaf.data(), *volumes);
                 if (found.ok())
@@ -283,9 +284,25 @@ void DirectoryCache::remember(DeviceId device, std::uint64_t inode, std::uint64_
     const Key key{device, inode};
     MutexLock lock(mutex_);
     missing_.erase(key);
-    if (hints_.size() >= hint_limit_ && !hints_.contains(key))
-        hints_.erase(hints_.begin());
-    hints_[key] = {parent, std::move(leaf)};
+    put_hint(key, {parent, std::move(leaf)});
+}
+
+const DirectoryCache::Hint* DirectoryCache::find_hint(const Key& key) {
+    if (const auto young = young_hints_.find(key); young != young_hints_.end())
+        return &young->second;
+    const auto old = old_hints_.find(key);
+    if (old == old_hints_.end())
+        return nullptr;
+    put_hint(key, Hint(std::move(old->second)));
+    return &young_hints_.find(key)->second;
+}
+
+void DirectoryCache::put_hint(const Key& key, Hint hint) {
+    if (young_hints_.size() >= hint_limit_ / 2 && !young_hints_.contains(key)) {
+        old_hints_ = std::move(young_hints_);
+        young_hints_.clear();
+    }
+    young_hints_[key] = std::move(hint);
 }
 
 void DirectoryCache::remember_closed(const std::vector<Handle>& closed) {
@@ -308,7 +325,8 @@ void DirectoryCache::forget(DeviceId device) {
         }
         slot = next;
     }
-    std::erase_if(hints_, [&](const auto& hint) { return hint.first.device == device; });
+    for (Hints* hints : {&young_hints_, &old_hints_})
+        std::erase_if(*hints, [&](const auto& hint) { return hint.first.device == device; });
     std::erase_if(missing_, [&](const auto& missing) { return missing.first.device == device; });
     lock.unlock();
 }
@@ -318,7 +336,8 @@ void DirectoryCache::clear() {
     MutexLock lock(mutex_);
     closed.swap(recent_);
     open_.clear();
-    hints_.clear();
+    young_hints_.clear();
+    old_hints_.clear();
     missing_.clear();
     lock.unlock();
 }

@@ -19,8 +19,8 @@
 
 namespace host {
 
-/// Finds open directories by volume and inode: the last few hundred stay open, and for many more is
-/// remembered in which directory they were last seen and under what name. Any thread.
+/// Finds open directories by volume and inode: the last few hundred stay open, and of a million more is
+/// remembered in which directory they were last seen and under what name (some 130 bytes each). Any thread.
 ///
 /// Directories on file systems other than those of "/" and of the user's home are closed when they have not
 /// been used for a few seconds, so that a removable volume can be unmounted.
@@ -28,7 +28,7 @@ class DirectoryCache {
   public:
     static DirectoryCache& instance();
 
-    explicit DirectoryCache(std::size_t open_limit = 384, std::size_t hint_limit = 65536);
+    explicit DirectoryCache(std::size_t open_limit = 384, std::size_t hint_limit = 1048576);
     ~DirectoryCache();
     DirectoryCache(const DirectoryCache&) = delete;
     DirectoryCache& operator=(const DirectoryCache&) = delete;
@@ -36,8 +36,9 @@ class DirectoryCache {
     using Handle = std::shared_ptr<const Directory>;
 
     /// `whole_volume`: where neither the open directories nor the hints lead to it, the directory that it was
-    /// last seen in is searched and then, breadth first, all directories of the volume. That takes seconds on
-    /// a large one, so whoever asks for many that may be gone asks for `hints_only`.
+    /// last seen in is searched and then, breadth first, all directories of the volume; those that it passes
+    /// are remembered. That takes seconds on a large one, so whoever asks for many that may be gone asks for
+    /// `hints_only`.
     enum class Search { hints_only, whole_volume };
     /// ENOENT when the volume has no such directory (any more), ENODEV when there is no such volume.
     Result<Handle> find(DeviceId device, std::uint64_t inode, Search search = Search::whole_volume);
@@ -52,7 +53,7 @@ class DirectoryCache {
     Result<Handle> open_path(const char* path);
 
     /// Tells where a directory is thought to be, so that find() needs no search. May be wrong: whatever is
-    /// found there is verified.
+    /// found there is verified. At least the `hint_limit` / 2 that were told or used last are kept.
     void remember(DeviceId device, std::uint64_t inode, std::uint64_t parent, std::string leaf);
 
     /// Closes what nobody else holds of this volume, and forgets its hints.
@@ -81,8 +82,11 @@ class DirectoryCache {
         std::uint64_t parent = 0;
         std::string leaf;
     };
+    using Hints = std::unordered_map<Key, Hint, KeyHash>;
 
     Handle find_open(const Key& key);
+    const Hint* find_hint(const Key& key) REQUIRES(mutex_);
+    void put_hint(const Key& key, Hint hint) REQUIRES(mutex_);
     Result<Handle> find_root(const Key& key);
     Result<Handle> find_by_hint(const Key& key, int depth);
     Result<Handle> find_in_hinted_parent(const Key& key);
@@ -102,7 +106,10 @@ class DirectoryCache {
     mutable Mutex mutex_;
     std::list<Slot> recent_ GUARDED_BY(mutex_); ///< most recently used first
     std::unordered_map<Key, std::list<Slot>::iterator, KeyHash> open_ GUARDED_BY(mutex_);
-    std::unordered_map<Key, Hint, KeyHash> hints_ GUARDED_BY(mutex_);
+    /// Two generations: new and used hints go into the young one; when that holds half of what there may be,
+    /// it becomes the old one, whose place it takes.
+    Hints young_hints_ GUARDED_BY(mutex_);
+    Hints old_hints_ GUARDED_BY(mutex_);
     /// Searched for in vain: until when, on the steady clock, no new search is made.
     std::unordered_map<Key, std::int64_t, KeyHash> missing_ GUARDED_BY(mutex_);
     std::thread janitor_ GUARDED_BY(mutex_);

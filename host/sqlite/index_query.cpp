@@ -1,6 +1,7 @@
 #include "host/sqlite/index_query.h"
 #include "host/linux/system_calls.h"
 #include "host/linux/volume_table.h"
+#include "host/sqlite/known_directory.h"
 #include <algorithm>
 #include <cerrno>
 #include <fcntl.h>
@@ -33,18 +34,7 @@ const Directory* IndexQuery::directory_of(std::uint64_t inode) {
     if (found == directories_.end()) {
         if (directories_.size() >= kHeldDirectories)
             directories_.clear();
-        DirectoryCache& cache = DirectoryCache::instance();
-        auto handle = cache.find(index_->device(), inode, DirectoryCache::Search::hints_only);
-        for (std::uint64_t at = inode; !handle && at != 0;) {
-            IndexStore::KnownDirectory known;
-            if (reader_->directory(at, known) != DatabaseResult::row)
-                break;
-            cache.remember(index_->device(), known.inode, known.parent, known.name);
-            handle = cache.find(index_->device(), inode, DirectoryCache::Search::hints_only);
-            at = known.parent == at ? 0 : known.parent;
-        }
-        if (!handle)
-            handle = cache.find(index_->device(), inode, DirectoryCache::Search::whole_volume);
+        const auto handle = find_known_directory(*reader_, index_->device(), inode);
         if (!handle)
             volume_is_gone_ = VolumeTable::instance().refresh()->find(index_->device()) == nullptr;
         found = directories_.emplace(inode, handle ? *handle : nullptr).first;

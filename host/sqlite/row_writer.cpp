@@ -1,5 +1,6 @@
 #include "host/sqlite/row_writer.h"
 #include "host/linux/volume_table.h"
+#include "host/sqlite/known_directory.h"
 #include <algorithm>
 #include <cerrno>
 #include <fcntl.h>
@@ -18,14 +19,10 @@ void RowWriter::reset() {
 DirectoryCache::Handle RowWriter::find_directory(const ChangeNote& note) {
     if (note.directory == last_directory_)
         return last_handle_;
-    DirectoryCache& cache = DirectoryCache::instance();
-    auto found = cache.find(device_, note.directory, DirectoryCache::Search::hints_only);
-    if (!found && note.source != ChangeNote::Source::vanished) {
-        IndexStore::KnownDirectory known;
-        if (store_.directory(note.directory, known) == DatabaseResult::row)
-            cache.remember(device_, known.inode, known.parent, known.name);
-        found = cache.find(device_, note.directory, DirectoryCache::Search::whole_volume);
-    }
+    const auto found =
+        note.source == ChangeNote::Source::vanished
+            ? DirectoryCache::instance().find(device_, note.directory, DirectoryCache::Search::hints_only)
+            : find_known_directory(store_, device_, note.directory);
     last_directory_ = note.directory;
     last_handle_ = found ? *found : nullptr;
     last_error_ = found.status();

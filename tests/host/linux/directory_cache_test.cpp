@@ -82,6 +82,34 @@ TEST_F(DirectoryCacheTest, RemembersWhereClosedDirectoriesAre) {
     EXPECT_TRUE(cache_.find(device_, first, DirectoryCache::Search::hints_only).ok());
 }
 
+TEST_F(DirectoryCacheTest, KeepsTheNewestHintsAndThoseInUseAmongTooMany) {
+    const std::uint64_t root = volumes().info(device_)->root_inode;
+    std::vector<std::uint64_t> inodes;
+    for (int i = 0; i < 200; ++i) {
+        inodes.push_back(make("d" + std::to_string(i)));
+        cache_.remember(device_, inodes.back(), root, "d" + std::to_string(i));
+        // In use from the beginning on.
+        EXPECT_TRUE(cache_.find(device_, inodes.front(), DirectoryCache::Search::hints_only).ok()) << i;
+    }
+    // Of 64 at least half.
+    for (int i = 199; i >= 200 - 31; --i)
+        EXPECT_TRUE(
+            cache_.find(device_, inodes[static_cast<std::size_t>(i)], DirectoryCache::Search::hints_only)
+                .ok())
+            << i;
+    EXPECT_EQ(cache_.find(device_, inodes[1], DirectoryCache::Search::hints_only).error(), ENOENT);
+}
+
+TEST_F(DirectoryCacheTest, ASearchRemembersTheDirectoriesThatItPasses) {
+    std::vector<std::uint64_t> passed;
+    for (const char* const name : {"a", "b", "a/c", "b/d"})
+        passed.push_back(make(name));
+    const std::uint64_t deepest = make("a/c/e");
+    ASSERT_TRUE(cache_.find(device_, deepest).ok());
+    for (const std::uint64_t inode : passed)
+        EXPECT_TRUE(cache_.find(device_, inode, DirectoryCache::Search::hints_only).ok());
+}
+
 TEST_F(DirectoryCacheTest, FindsADirectoryAfterItAndItsParentsWereRenamedAndMoved) {
     const std::uint64_t inode = make("a/b/c");
     ASSERT_TRUE(cache_.open_path(path("a/b/c").c_str()).ok());

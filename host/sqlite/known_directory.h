@@ -1,0 +1,13 @@
+#pragma once
+
+#include "host/linux/directory_cache.h"
+#include "host/sqlite/index_store.h"
+
+namespace host {
+
+/// Opens a directory of which the index holds rows: by the hints of the DirectoryCache; where they do not
+/// suffice by what `store` knows of it and of the directories above it; at last by a search of the whole
+/// volume. Fails as DirectoryCache::find() does. For the thread that `store` belongs to.
+Result<DirectoryCache::Handle> find_known_directory(IndexStore& store, DeviceId device, std::uint64_t inode);
+
+} // namespace host
