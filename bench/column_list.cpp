@@ -4,6 +4,7 @@
 // With "processor" times are those that the measuring thread had a processor, for machines that do other
 // work.
 #include "support/Figures.h"
+#include "support/Frames.h"
 
 #include "gui/ColumnListView/CLVContainerView.h"
 #include "gui/ColumnListView/CLVEasyItem.h"
@@ -19,27 +20,24 @@
 #include <random>
 #include <string>
 #include <thread>
-#include <time.h>
 #include <vector>
 
 namespace {
 
 using bench::Better;
 
-bool processorTime = false;
+bench::Time timeKind = bench::Time::onTheClock;
 
 // All that is measured happens in the thread that measures.
 class Watch {
   public:
-    double Milliseconds() const { return (Now() - mStart) * 1e3; }
+    double Milliseconds() const {
+        return 1e3 * (timeKind == bench::Time::ofAProcessor ? mUsed.Seconds() : mPassed.Seconds());
+    }
 
   private:
-    static double Now() {
-        timespec now;
-        clock_gettime(processorTime ? CLOCK_THREAD_CPUTIME_ID : CLOCK_MONOTONIC, &now);
-        return static_cast<double>(now.tv_sec) + static_cast<double>(now.tv_nsec) * 1e-9;
-    }
-    double mStart = Now();
+    bench::Stopwatch mPassed;
+    bench::ProcessorStopwatch mUsed;
 };
 
 constexpr int kRounds = 5;
@@ -47,11 +45,6 @@ constexpr int kFrames = 600;
 constexpr int32 kColumns = 6;
 constexpr double kFrameAt60Hz = 1000.0 / 60;
 typedef std::vector<std::unique_ptr<CLVEasyItem>> Rows;
-
-double PartAt(std::vector<double> values, double part) {
-    std::sort(values.begin(), values.end());
-    return values[static_cast<size_t>(part * static_cast<double>(values.size() - 1))];
-}
 
 // Counts the cells that it draws.
 class Row : public CLVEasyItem {
@@ -236,30 +229,26 @@ bool MeasureScrolling(int count) {
     window.Update();
     std::mt19937 random(1);
     const float height = window.list->ItemFrame(count - 1).bottom - window.list->Bounds().Height();
-    const auto frames = [&](const auto& nextTop) {
-        std::vector<double> times;
-        for (int i = 0; i < kFrames; ++i) {
-            const float top = nextTop();
-            const Watch watch;
-            window.list->ScrollTo(BPoint(0, top));
-            window.Update();
-            times.push_back(watch.Milliseconds());
-        }
-        return times;
-    };
     std::uniform_real_distribution<float> anywhere(0, height);
-    const std::vector<double> jumps = frames([&] { return std::floor(anywhere(random)); });
-    float top = std::floor(height / 2);
-    const std::vector<double> steps = frames([&] { return top += 48; });
+    std::vector<float> tops;
+    for (int i = 0; i < kFrames; ++i) {
+        tops.push_back(std::floor(anywhere(random)));
+    }
+    const auto jump = [&](int frame) {
+        window.list->ScrollTo(BPoint(0, tops[static_cast<size_t>(frame)]));
+        window.Update();
+    };
+    const float middle = std::floor(height / 2);
+    const auto step = [&](int frame) {
+        window.list->ScrollTo(BPoint(0, middle + 48.0F * static_cast<float>(frame + 1)));
+        window.Update();
+    };
+    const bench::FrameLimits limits{8, 16, "limit"};
     const std::string where = " in " + std::to_string(count) + " rows, ";
-    bool reached = bench::Report("scroll anywhere" + where + "95 %", PartAt(jumps, 0.95), "ms", "limit", 8, 1,
-                                 Better::lower);
-    reached &= bench::Report("scroll anywhere" + where + "slowest", PartAt(jumps, 1), "ms", "limit", 16, 1,
-                             Better::lower);
-    reached &= bench::Report("scroll by 48 pixels" + where + "95 %", PartAt(steps, 0.95), "ms", "limit", 8, 1,
-                             Better::lower);
-    reached &= bench::Report("scroll by 48 pixels" + where + "slowest", PartAt(steps, 1), "ms", "limit", 16,
-                             1, Better::lower);
+    bool reached = bench::ReportFrames("scroll anywhere" + where, bench::MeasureFrames(kFrames, jump), limits,
+                                       timeKind, jump);
+    reached &= bench::ReportFrames("scroll by 48 pixels" + where, bench::MeasureFrames(kFrames, step), limits,
+                                   timeKind, step);
     return reached;
 }
 
@@ -272,24 +261,22 @@ bool MeasureResizing(int count) {
     window.list->Invalidate();
     window.Update();
     const int whole = Row::drawn;
-    std::vector<double> times;
-    std::vector<double> cells;
     CLVColumn* const column = window.list->ColumnAt(2);
-    for (int i = 0; i < kFrames; ++i) {
+    const float narrow = column->Width();
+    std::vector<double> cells;
+    // By two pixels each, to and fro.
+    const auto step = [&](int frame) {
+        const int turn = frame % 120;
         Row::drawn = 0;
-        const Watch watch;
-        column->SetWidth(column->Width() + (i / 60 % 2 == 0 ? 2.0F : -2.0F));
+        column->SetWidth(narrow + 2.0F * static_cast<float>(turn < 60 ? turn + 1 : 119 - turn));
         window.Update();
-        times.push_back(watch.Milliseconds());
         cells.push_back(Row::drawn);
-    }
-    const std::string what = "resize a column of " + std::to_string(count) + " rows, a step, ";
-    bool reached = bench::Report(what + "95 %", PartAt(times, 0.95), "ms", "a frame at 60 Hz", kFrameAt60Hz,
-                                 1, Better::lower);
-    reached &= bench::Report(what + "slowest", PartAt(times, 1), "ms", "a frame at 60 Hz", kFrameAt60Hz, 1,
-                             Better::lower);
-    reached &= bench::Report("cells drawn in a step, median", bench::Median(cells), "cells",
-                             "drawing the whole list", whole, 0.5, Better::lower);
+    };
+    const bench::FrameCosts costs = bench::MeasureFrames(kFrames, step);
+    bool reached = bench::Report("cells drawn in a step, median", bench::Median(cells), "cells",
+                                 "drawing the whole list", whole, 0.5, Better::lower);
+    reached &= bench::ReportFrames("resize a column of " + std::to_string(count) + " rows, a step, ", costs,
+                                   {kFrameAt60Hz, kFrameAt60Hz, "a frame at 60 Hz"}, timeKind, step);
     return reached;
 }
 
@@ -320,26 +307,47 @@ bool MeasureMemory(int count) {
     return reached;
 }
 
+// Measures in a thread of its own, from when the display is there.
+class Measuring : public BApplication {
+  public:
+    Measuring(int rows, int scrolled)
+        : BApplication("application/x-vnd.Quirnel-ColumnListBench"), mRows(rows), mScrolled(scrolled) {}
+
+    void ReadyToRun() override {
+        mThread = std::thread([this] {
+            mReached &= MeasureMemory(mRows);
+            mReached &= MeasureAppending(mRows);
+            mReached &= MeasureSorting(mRows);
+            mReached &= MeasureExpanding(mRows / 2 + 1);
+            mReached &= MeasureResizing(mRows);
+            mReached &= MeasureScrolling(mScrolled);
+            PostMessage(B_QUIT_REQUESTED);
+        });
+    }
+    // After Run().
+    bool Reached() {
+        mThread.join();
+        return mReached;
+    }
+
+  private:
+    const int mRows;
+    const int mScrolled;
+    std::thread mThread;
+    bool mReached = true;
+};
+
 } // namespace
 
 int main(int count, char** words) {
     const int rows = count > 1 ? std::atoi(words[1]) : 100000;
     const int scrolled = count > 2 ? std::atoi(words[2]) : 1000000;
-    processorTime = count > 3 && std::string(words[3]) == "processor";
+    if (count > 3 && std::string(words[3]) == "processor") {
+        timeKind = bench::Time::ofAProcessor;
+    }
     // A screen of its own is not needed: what is measured ends where the display's copy is made.
     setenv("QT_QPA_PLATFORM", "offscreen", 0);
-    BApplication application("application/x-vnd.Quirnel-ColumnListBench");
-    bool reached = true;
-    std::thread measuring([&] {
-        reached &= MeasureMemory(rows);
-        reached &= MeasureAppending(rows);
-        reached &= MeasureSorting(rows);
-        reached &= MeasureExpanding(rows / 2 + 1);
-        reached &= MeasureResizing(rows);
-        reached &= MeasureScrolling(scrolled);
-        application.PostMessage(B_QUIT_REQUESTED);
-    });
+    Measuring application(rows, scrolled);
     application.Run();
-    measuring.join();
-    return reached ? 0 : 1;
+    return application.Reached() ? 0 : 1;
 }
