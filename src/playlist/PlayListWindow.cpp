@@ -41,8 +41,8 @@ void PlayListWindow::AddViews() {
     back->SetViewColor(kBackground);
     AddChild(back);
 
-    auto* const menuBar = new BMenuBar(BRect(0, 0, 300, kMenuBarHeight), "menubar",
-                                       B_FOLLOW_LEFT | B_FOLLOW_RIGHT | B_FOLLOW_TOP);
+    auto* const menuBar =
+        new BMenuBar(BRect(0, 0, 300, kMenuBarHeight), "menubar", B_FOLLOW_LEFT_RIGHT | B_FOLLOW_TOP);
     menuBar->AddItem(brindle_app->MakeFileMenu(MSG_OPEN_PLAYLIST_WINDOW, MSG_PLAYLIST_WINDOW_CLOSED));
     back->AddChild(menuBar);
 

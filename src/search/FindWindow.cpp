@@ -50,8 +50,7 @@ void FindWindow::AddViews() {
     back->SetViewColor(kBackground);
     AddChild(back);
 
-    auto* const menuBar =
-        new BMenuBar(BRect(0, 0, 300, 20), "menubar", B_FOLLOW_LEFT | B_FOLLOW_RIGHT | B_FOLLOW_TOP);
+    auto* const menuBar = new BMenuBar(BRect(0, 0, 300, 20), "menubar", B_FOLLOW_LEFT_RIGHT | B_FOLLOW_TOP);
     menuBar->AddItem(brindle_app->MakeFileMenu(MSG_OPEN_FIND_WINDOW, MSG_FIND_WINDOW_CLOSED));
     back->AddChild(menuBar);
 

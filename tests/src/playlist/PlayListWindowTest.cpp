@@ -85,6 +85,7 @@ TEST_F(PlayListWindowTest, HoldsAMenuBarAndTheListInFrontOfDarkBlue) {
         EXPECT_EQ(mWindow->List()->ConvertToScreen(mWindow->List()->Bounds()).RightBottom(),
                   list.RightBottom() + BPoint(100, 50));
         EXPECT_EQ(back->Frame(), BRect(0, 0, 400, 250));
+        EXPECT_EQ(menuBar->Frame().right, 400);
     });
 }
 

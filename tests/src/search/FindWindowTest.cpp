@@ -51,6 +51,11 @@ TEST_F(FindWindowTest, HoldsAMenuBarAFieldAndAListInFrontOfDarkBlue) {
         EXPECT_EQ(list.RightBottom(), BPoint(300 + 436, 30 + 186));
         EXPECT_EQ(list.left, 300);
         EXPECT_GT(list.top, 30 + 48 + 14);
+
+        // The bar spans the window, the field keeps its width.
+        mWindow->ResizeBy(100, 50);
+        EXPECT_EQ(mWindow->FindView("menubar")->Frame().right, 550);
+        EXPECT_EQ(field->Frame().right, 240);
     });
 }
 
