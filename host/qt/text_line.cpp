@@ -70,10 +70,14 @@ std::vector<float> TextLine::advances() const {
     if (!line_.isValid()) {
         return advances;
     }
+    // Each border of two code points is asked for once: finding one walks the line.
+    qreal here = advances.empty() ? 0 : line_.cursorToX(shown_.starts.front());
     for (std::size_t i = 0; i < advances.size(); ++i) {
         const int end = i + 1 < advances.size() ? shown_.starts[i + 1] : static_cast<int>(shown_.text.size());
+        const qreal there = line_.cursorToX(end);
         // In right-to-left runs the cursor walks backwards; an advance has no direction.
-        advances[i] = static_cast<float>(std::abs(line_.cursorToX(end) - line_.cursorToX(shown_.starts[i])));
+        advances[i] = static_cast<float>(std::abs(there - here));
+        here = there;
     }
     return advances;
 }

@@ -121,6 +121,18 @@ TEST(Fonts, AdvancesOfAllCodePointsAddUpToTheWidth) {
               5U);
 }
 
+TEST(Fonts, LettersKeepTheirAdvancesFromRightToLeft) {
+    const host::FontSpec font;
+    // Hebrew letters, which do not join: he, yod, shin.
+    const std::string_view letters[] = {"\xD7\x94", "\xD7\x99", "\xD7\xA9"};
+    const std::vector<float> advances = host::text_advances(font, "\xD7\x94\xD7\x99\xD7\xA9");
+    ASSERT_EQ(advances.size(), 3U);
+    for (std::size_t i = 0; i < 3; ++i) {
+        EXPECT_GT(advances[i], 0) << i;
+        EXPECT_NEAR(advances[i], host::text_width(font, letters[i]), 0.51F) << i;
+    }
+}
+
 TEST(Fonts, EachInvalidByteIsOneReplacementCharacter) {
     const host::FontSpec font;
     const float one = host::text_width(font, "\xEF\xBF\xBD");
