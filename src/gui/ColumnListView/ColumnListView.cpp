@@ -87,6 +87,15 @@ void ColumnListView::SetFont(const BFont* font, uint32 mask) {
     UpdateDataRect(true);
 }
 
+// A row may change its height without telling: the list learns of it when it next looks at the row, and it
+// looks at all that it draws.
+void ColumnListView::Draw(BRect update_rect) {
+    BListView::Draw(update_rect);
+    if (DataHeight() != mContainer->GetDataRect().Height()) {
+        UpdateDataRect(true);
+    }
+}
+
 void ColumnListView::MouseDown(BPoint where) {
     AssertWindowLocked();
     auto* const item = static_cast<CLVListItem*>(ItemAt(IndexOf(where)));
@@ -124,8 +133,11 @@ void ColumnListView::UpdateDataRect(bool scroll_bars) {
     if (Parent() == nullptr) {
         return;
     }
-    const float height = IsEmpty() ? 0 : ItemFrame(CountItems() - 1).bottom;
-    mContainer->SetDataRect(BRect(0, 0, mDataWidth, height), scroll_bars);
+    mContainer->SetDataRect(BRect(0, 0, mDataWidth, DataHeight()), scroll_bars);
+}
+
+float ColumnListView::DataHeight() {
+    return IsEmpty() ? 0 : ItemFrame(CountItems() - 1).bottom;
 }
 
 void ColumnListView::AssertWindowLocked() const {

@@ -49,6 +49,8 @@ class ColumnListView : public BListView {
 
     void AttachedToWindow() override;
     void SetFont(const BFont* font, uint32 mask = B_FONT_ALL) override;
+    // What a row has changed of its height by itself counts from here on.
+    void Draw(BRect update_rect) override;
     // On the arrow of a super-row it expands or collapses, and does nothing else.
     void MouseDown(BPoint where) override;
     // In an outline with one row selected, the right arrow key expands a super-row and goes on to the first
@@ -185,6 +187,7 @@ class ColumnListView : public BListView {
     bool AddColumns(const BList& columns);
     void ForgetColumns(int32 index, int32 count);
     void UpdateDataRect(bool scroll_bars);
+    float DataHeight();
     void InvalidateShifted(const CLVColumn& column, float limit);
     void InvalidateHeaderOf(const CLVColumn* column);
 

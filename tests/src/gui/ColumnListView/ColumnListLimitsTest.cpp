@@ -60,6 +60,37 @@ TEST(ColumnListLimits, AListWhoseColumnsAreAllHiddenIsDrawnAndTakesGestures) {
     EXPECT_EQ(stage.Picture(), stage.PictureDrawnAnew());
 }
 
+TEST(ColumnListLimits, ARowThatChangesItsHeightByItselfChangesTheData) {
+    HeaderStage stage(200, 90);
+    stage.AddColumn("Only", 50);
+    stage.AddRow(0, {"first"});
+    stage.AddRow(0, {"second"});
+    const auto change = [&](size_t row, float height) {
+        stage.Locked([&] {
+            stage.rows[row]->SetHeight(height);
+            stage.list->InvalidateItem(static_cast<int32>(row));
+        });
+        stage.Redraw();
+    };
+    change(0, 19);
+    change(1, 499);
+    float most = 0;
+    stage.Locked([&] {
+        EXPECT_EQ(stage.container->GetDataRect(), BRect(0, 0, 50, 519));
+        stage.container->ScrollBar(B_VERTICAL)->GetRange(nullptr, &most);
+        EXPECT_EQ(most, 519 - stage.list->Bounds().Height());
+        stage.list->ScrollTo(BPoint(0, most));
+    });
+    stage.Redraw();
+
+    change(1, 29);
+    stage.Locked([&] {
+        EXPECT_EQ(stage.container->GetDataRect(), BRect(0, 0, 50, 49));
+        EXPECT_EQ(stage.list->Bounds().top, 0) << "nothing shows beyond the rows";
+    });
+    EXPECT_EQ(stage.Picture(), stage.PictureDrawnAnew());
+}
+
 TEST(ColumnListLimits, AColumnOfAHundredThousandPixelsCanBeScrolledAndResized) {
     HeaderStage stage(200, 90);
     CLVColumn* const wide = stage.AddColumn("Wide", 100000, CLV_COLUMN_HEADER_TRUNCATE);
