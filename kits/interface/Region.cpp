@@ -178,5 +178,10 @@ void BRegion::Exclude(const BRegion* other) {
 }
 
 void BRegion::IntersectWith(const BRegion* other) {
+    // The common case, a clip that lies within its view: nothing is cut off, nothing need be built.
+    if (const clipping_rect frame = FrameInt();
+        other->mRects.size() == 1 && intersection(other->mRects.front(), frame) == frame) {
+        return;
+    }
     mRects = RegionBuilder::Intersection(mRects, other->mRects);
 }

@@ -70,6 +70,33 @@ TEST(Region, IntersectionOfRegionsKeepsWhatBothHave) {
     EXPECT_EQ(Print(a), "(2,0,3,0)(6,0,7,0)(2,4,3,4)(6,4,7,4)");
 }
 
+TEST(Region, OneRectangleCutsOffWhatLiesBeyondIt) {
+    struct Case {
+        clipping_rect limit;
+        const char* left;
+    };
+    const Case cases[] = {
+        {{0, 0, 9, 4}, "(0,0,9,0)(3,4,5,4)"},
+        {{-5, -5, 50, 50}, "(0,0,9,0)(3,4,5,4)"},
+        {{1, 0, 9, 4}, "(1,0,9,0)(3,4,5,4)"},
+        {{0, 1, 9, 4}, "(3,4,5,4)"},
+        {{0, 0, 8, 4}, "(0,0,8,0)(3,4,5,4)"},
+        {{0, 0, 9, 3}, "(0,0,9,0)"},
+        {{20, 20, 29, 29}, ""},
+    };
+    for (const Case& each : cases) {
+        BRegion region(BRect(0, 0, 9, 0));
+        region.Include(BRect(3, 4, 5, 4));
+        const BRegion limit(each.limit);
+        region.IntersectWith(&limit);
+        EXPECT_EQ(Print(region), each.left) << Print(limit);
+    }
+    BRegion nothing;
+    const BRegion limit(BRect(0, 0, 9, 9));
+    nothing.IntersectWith(&limit);
+    EXPECT_TRUE(nothing.IsEmpty());
+}
+
 TEST(Region, OffsetMovesEverything) {
     BRegion region(BRect(0, 0, 9, 9));
     region.Exclude(BRect(3, 3, 6, 6));
