@@ -104,9 +104,11 @@ void Painter::FillClipped(const clipping_rect& rect, const Ink& ink) {
 void Painter::FillSolid(const clipping_rect& device, pixel32 color) {
     const auto count = static_cast<size_t>(WidthOf(device));
     if (mSurface.space == B_RGB32 || mSurface.space == B_RGBA32) {
-        for (int32 y = device.top; y <= device.bottom; ++y) {
-            auto* row = reinterpret_cast<pixel32*>(mSurface.Row(y));
-            std::fill_n(row + device.left, count, color);
+        auto* const first = reinterpret_cast<pixel32*>(mSurface.Row(device.top)) + device.left;
+        std::fill_n(first, count, color);
+        // The library copies faster than a loop writes.
+        for (int32 y = device.top + 1; y <= device.bottom; ++y) {
+            memcpy(reinterpret_cast<pixel32*>(mSurface.Row(y)) + device.left, first, count * sizeof(pixel32));
         }
         return;
     }
