@@ -13,6 +13,13 @@ if(QUIRNEL_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
   set(CMAKE_CXX_COMPILER_LAUNCHER "${QUIRNEL_CCACHE}")
 endif()
 
+# ccache keeps single files and cannot always keep what was compiled with a precompiled header.
+set(QUIRNEL_PRECOMPILE_DEFAULT OFF)
+if(NOT CMAKE_CXX_COMPILER_LAUNCHER AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+  set(QUIRNEL_PRECOMPILE_DEFAULT ON)
+endif()
+option(QUIRNEL_PRECOMPILE "Parse the standard library's and GoogleTest's headers once a tree" ${QUIRNEL_PRECOMPILE_DEFAULT})
+
 add_library(quirnel_options INTERFACE)
 target_compile_options(quirnel_options INTERFACE
   -Wall -Wextra -Wshadow -Wconversion -Wnon-virtual-dtor -Woverloaded-virtual -Werror
@@ -20,13 +27,45 @@ target_compile_options(quirnel_options INTERFACE
   $<$<CXX_COMPILER_ID:Clang>:-Wthread-safety>)
 if(QUIRNEL_SANITIZE)
   target_compile_options(quirnel_options INTERFACE
-    -fsanitize=${QUIRNEL_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
+    -fsanitize=${QUIRNEL_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all
+    $<$<BOOL:$<TARGET_PROPERTY:QUIRNEL_ASSERTS>>:-fno-sanitize=null,alignment,object-size,vptr>)
   target_link_options(quirnel_options INTERFACE -fsanitize=${QUIRNEL_SANITIZE})
 endif()
 if(QUIRNEL_FUZZ)
   target_compile_options(quirnel_options INTERFACE -fsanitize=fuzzer-no-link)
 endif()
 target_link_libraries(quirnel_options INTERFACE Threads::Threads)
+
+# What most sources spend most of their compilation on. A source includes what it needs all the same: with ccache,
+# and in the tree of the fuzzers, nothing is precompiled.
+if(QUIRNEL_PRECOMPILE)
+  # Where a dependency's flags are others (libmpv's), the headers are read as they are.
+  set(CMAKE_PCH_WARN_INVALID OFF)
+  set(QUIRNEL_COMMON_HEADERS
+    <algorithm> <chrono> <functional> <map> <memory> <mutex> <string> <string_view> <thread> <vector>)
+  file(CONFIGURE OUTPUT "${PROJECT_BINARY_DIR}/precompiled_headers.cpp" CONTENT "int main() { return 0; }\n")
+  add_library(quirnel_library_headers STATIC EXCLUDE_FROM_ALL "${PROJECT_BINARY_DIR}/precompiled_headers.cpp")
+  target_link_libraries(quirnel_library_headers PRIVATE quirnel_options)
+  target_precompile_headers(quirnel_library_headers PRIVATE ${QUIRNEL_COMMON_HEADERS})
+endif()
+
+# The headers' program is compiled as tests are.
+function(quirnel_use_test_headers name)
+  if(NOT TARGET quirnel_test_headers)
+    add_executable(quirnel_test_headers EXCLUDE_FROM_ALL "${PROJECT_BINARY_DIR}/precompiled_headers.cpp")
+    target_link_libraries(quirnel_test_headers PRIVATE quirnel_options GTest::gtest)
+    quirnel_compile_as_test(quirnel_test_headers)
+    target_precompile_headers(quirnel_test_headers PRIVATE ${QUIRNEL_COMMON_HEADERS} <filesystem> <gtest/gtest.h>)
+  endif()
+  target_precompile_headers(${name} REUSE_FROM quirnel_test_headers)
+endfunction()
+
+# Assertions take twice as long to compile when they are optimised, or looked into for what their own pointers point to;
+# what they test is both.
+function(quirnel_compile_as_test name)
+  target_compile_options(${name} PRIVATE $<$<CONFIG:Debug>:-O0>)
+  set_target_properties(${name} PROPERTIES QUIRNEL_ASSERTS ON)
+endfunction()
 
 # quirnel_library(NAME SOURCES a.cpp ... [PUBLIC lib ...] [PRIVATE lib ...])
 # A static library whose own folder is on its users' include path.
@@ -35,6 +74,9 @@ function(quirnel_library name)
   add_library(${name} STATIC ${ARG_SOURCES})
   target_include_directories(${name} PUBLIC "${CMAKE_CURRENT_SOURCE_DIR}")
   target_link_libraries(${name} PUBLIC ${ARG_PUBLIC} PRIVATE quirnel_options ${ARG_PRIVATE})
+  if(QUIRNEL_PRECOMPILE)
+    target_precompile_headers(${name} REUSE_FROM quirnel_library_headers)
+  endif()
 endfunction()
 
 # quirnel_program(NAME SOURCES a.cpp ... LINKS lib ...)
@@ -83,8 +125,10 @@ function(quirnel_test name)
   add_executable(${name} ${ARG_SOURCES})
   target_link_libraries(${name} PRIVATE ${ARG_LINKS} quirnel_options GTest::gtest GTest::gmock GTest::gtest_main)
   target_include_directories(${name} PRIVATE "${PROJECT_SOURCE_DIR}" "${PROJECT_SOURCE_DIR}/tests")
-  # Optimising assertions takes as long again as compiling them; what they test is optimised.
-  target_compile_options(${name} PRIVATE $<$<CONFIG:Debug>:-O0>)
+  quirnel_compile_as_test(${name})
+  if(QUIRNEL_PRECOMPILE)
+    quirnel_use_test_headers(${name})
+  endif()
   add_test(NAME ${name} COMMAND ${name})
   set_tests_properties(${name} PROPERTIES LABELS ${ARG_TIER} TIMEOUT ${ARG_TIMEOUT}
     ENVIRONMENT "QT_QPA_PLATFORM=offscreen;TSAN_OPTIONS=ignore_noninstrumented_modules=1:suppressions=${PROJECT_SOURCE_DIR}/tests/support/tsan.supp;LSAN_OPTIONS=suppressions=${PROJECT_SOURCE_DIR}/tests/support/lsan.supp:print_suppressions=0;UBSAN_OPTIONS=print_stacktrace=1")
