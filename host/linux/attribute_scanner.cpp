@@ -15,6 +15,7 @@ AttributeScanner::AttributeScanner(std::size_t largest_value)
       value_(std::max(std::min<std::size_t>(largest_value, XATTR_SIZE_MAX) + 4, AttributeMarker::kSize)) {}
 
 Status AttributeScanner::scan_erased(const AttributeFile& file, Callback callback, void* target) {
+    passed_over_ = false;
     ssize_t listed = system_calls().flistxattr(file.descriptor, names_.data(), names_.size());
     if (listed < 0 && errno == ERANGE) {
         names_.resize(XATTR_LIST_MAX);
@@ -35,15 +36,19 @@ Status AttributeScanner::scan_erased(const AttributeFile& file, Callback callbac
                 callback(target, attribute);
                 return;
             }
-            if (size < 4)
+            if (size < 4) {
+                passed_over_ = true;
                 return;
+            }
             const std::span<const std::byte> stored(value_.data(), static_cast<std::size_t>(size));
             attribute.type = load_big_endian(stored.data());
             attribute.bytes = stored.subspan(4);
             if (attribute.type == AttributeMarker::kReservedType) {
                 const std::optional<AttributeMarker> marker = AttributeMarker::decode(stored);
-                if (!marker || !read_spilled(file, *marker, attribute))
+                if (!marker || !read_spilled(file, *marker, attribute)) {
+                    passed_over_ = true;
                     return;
+                }
             } else if (attribute.bytes.size() > largest_value_) {
                 attribute.bytes = {};
                 attribute.complete = false;
@@ -57,6 +62,7 @@ bool AttributeScanner::read_spilled(const AttributeFile& file, const AttributeMa
                                     ScannedAttribute& attribute) {
     attribute.type = marker.type;
     attribute.bytes = {};
+    attribute.spilled = true;
     // Its bytes are not wanted, so whether they are whole is not found out.
     attribute.complete = marker.size <= largest_value_;
     if (!attribute.complete)

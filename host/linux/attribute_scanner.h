@@ -20,6 +20,7 @@ struct ScannedAttribute {
     /// The whole value, or empty when it is larger than the scanner takes (`complete` is false then).
     std::span<const std::byte> bytes;
     bool complete = true;
+    bool spilled = false; ///< the value lies in a blob
 };
 
 /// Reads all attributes of one file after another, for the indexer: one flistxattr and one fgetxattr per
@@ -43,12 +44,16 @@ class AttributeScanner {
             &visit);
     }
 
+    /// The last scan passed over an attribute that the file lists.
+    bool passed_over() const { return passed_over_; }
+
   private:
     using Callback = void (*)(void* target, const ScannedAttribute& attribute);
     Status scan_erased(const AttributeFile& file, Callback callback, void* target);
     bool read_spilled(const AttributeFile& file, const AttributeMarker& marker, ScannedAttribute& attribute);
 
     std::size_t largest_value_ = 0;
+    bool passed_over_ = false;
     std::vector<char> names_;
     std::vector<std::byte> value_;
     std::vector<std::byte> spilled_;

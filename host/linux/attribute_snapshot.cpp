@@ -2,8 +2,8 @@
 
 #include "host/linux/system_calls.h"
 #include <array>
+#include <atomic>
 #include <cerrno>
-#include <cstring>
 #include <ctime>
 
 namespace host {
@@ -34,69 +34,39 @@ void AttributeSnapshot::volume_changed(std::uint64_t volume) {
 
 void AttributeSnapshot::forget() {
     taken_at_ = 0;
-    names_size_ = 0;
-    values_size_ = 0;
-    entry_count_ = 0;
+    list_.clear();
+}
+
+AttributeSnapshot::Moment AttributeSnapshot::moment() const {
+    return {count_of(volume_).changes.load(std::memory_order_acquire), now()};
 }
 
 Status AttributeSnapshot::take(int descriptor) {
     forget();
     missed_ = false;
-    // Both are read before the list, so that nothing that happens meanwhile is missed.
-    const std::uint64_t changes = count_of(volume_).changes.load(std::memory_order_acquire);
-    const std::int64_t time = now();
-    const ssize_t size = system_calls().flistxattr(descriptor, names_, sizeof(names_));
+    // Before the list, so that nothing that happens meanwhile is missed.
+    const Moment before = moment();
+    const std::span<char> room = list_.room();
+    const ssize_t size = system_calls().flistxattr(descriptor, room.data(), room.size());
     if (size < 0)
         return errno;
-    const auto end = static_cast<std::size_t>(size);
-    for (std::size_t at = 0; at < end;) {
-        if (entry_count_ == kMostEntries) {
-            forget();
-            return ERANGE;
-        }
-        const std::size_t length = ::strnlen(names_ + at, end - at);
-        entries_[entry_count_++] = {static_cast<std::uint16_t>(at), static_cast<std::uint16_t>(length), 0, 0,
-                                    false};
-        at += length + 1;
-    }
-    names_size_ = end;
-    changes_ = changes;
-    taken_at_ = time;
+    if (!list_.take_names(static_cast<std::size_t>(size)))
+        return ERANGE;
+    changes_ = before.changes;
+    taken_at_ = before.time;
     return {};
+}
+
+void AttributeSnapshot::take(const AttributeList& list, const Moment& before) {
+    list_ = list;
+    missed_ = false;
+    changes_ = before.changes;
+    taken_at_ = before.time;
 }
 
 bool AttributeSnapshot::is_fresh() const {
     return taken_at_ != 0 && count_of(volume_).changes.load(std::memory_order_acquire) == changes_ &&
            now() - taken_at_ < kLifetime;
-}
-
-const AttributeSnapshot::Entry* AttributeSnapshot::find(std::string_view extended_name) const {
-    for (std::size_t i = 0; i < entry_count_; ++i) {
-        const Entry& entry = entries_[i];
-        if (entry.name_size == extended_name.size() &&
-            std::memcmp(names_ + entry.name, extended_name.data(), extended_name.size()) == 0)
-            return &entry;
-    }
-    return nullptr;
-}
-
-std::optional<std::span<const std::byte>> AttributeSnapshot::value(std::string_view extended_name) const {
-    const Entry* entry = find(extended_name);
-    if (entry == nullptr || !entry->has_value)
-        return std::nullopt;
-    return std::span(values_ + entry->value, entry->value_size);
-}
-
-void AttributeSnapshot::keep(std::string_view extended_name, std::span<const std::byte> value) {
-    const Entry* found = find(extended_name);
-    if (found == nullptr || value.size() > kValuesRoom - values_size_)
-        return;
-    Entry& entry = entries_[found - entries_];
-    std::memcpy(values_ + values_size_, value.data(), value.size());
-    entry.value = static_cast<std::uint16_t>(values_size_);
-    entry.value_size = static_cast<std::uint16_t>(value.size());
-    entry.has_value = true;
-    values_size_ += value.size();
 }
 
 } // namespace host

@@ -1,13 +1,12 @@
 #pragma once
 
 #include "host/api/result.h"
-#include <atomic>
+#include "host/linux/attribute_list.h"
 #include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <span>
 #include <string_view>
-#include <vector>
 
 namespace host {
 
@@ -27,51 +26,44 @@ class AttributeSnapshot {
     /// Lists the file's attributes anew and forgets all values. An error of flistxattr; lists too long to be
     /// kept answer ERANGE. Nothing is known then.
     Status take(int descriptor);
+    /// Takes what is known from elsewhere, and was found to hold after the moment.
+    struct Moment {
+        std::uint64_t changes = 0;
+        std::int64_t time = 0;
+    };
+    Moment moment() const;
+    void take(const AttributeList& list, const Moment& before);
     /// To be called before the questions below, once each time: false when nothing is known any more.
     bool is_fresh() const;
 
-    bool has(std::string_view extended_name) const { return find(extended_name) != nullptr; }
+    bool has(std::string_view extended_name) const { return list_.has(extended_name); }
     /// The value as it was kept; nothing when it was not.
-    std::optional<std::span<const std::byte>> value(std::string_view extended_name) const;
+    std::optional<std::span<const std::byte>> value(std::string_view extended_name) const {
+        return list_.value(extended_name);
+    }
     /// Keeps a value that has just been read, when there is room.
-    void keep(std::string_view extended_name, std::span<const std::byte> value);
+    void keep(std::string_view extended_name, std::span<const std::byte> value) {
+        list_.keep(extended_name, value);
+    }
 
     /// Remembers that something was asked for in vain, until the next take().
     void note_miss() { missed_ = true; }
     bool missed_before() const { return missed_; }
 
     /// All names, each with its terminating zero, as flistxattr gives them.
-    std::span<const char> list() const { return {names_, names_size_}; }
+    std::span<const char> list() const { return list_.names(); }
 
     /// Ends the snapshots of all files of that volume in this process. Any thread.
     static void volume_changed(std::uint64_t volume);
 
   private:
-    struct Entry {
-        std::uint16_t name;      // where it begins in names_
-        std::uint16_t name_size; // without its terminator
-        std::uint16_t value;     // where it begins in values_
-        std::uint16_t value_size;
-        bool has_value;
-    };
-    static constexpr std::size_t kNamesRoom = 1024;
-    static constexpr std::size_t kValuesRoom = 1536;
-    static constexpr std::size_t kMostEntries = 32;
-
-    const Entry* find(std::string_view extended_name) const;
     void forget();
 
     const std::uint64_t volume_;
     std::int64_t taken_at_ = 0; // 0: nothing is known
     bool missed_ = false;
     std::uint64_t changes_ = 0;
-    std::size_t names_size_ = 0;
-    std::size_t values_size_ = 0;
-    std::size_t entry_count_ = 0;
-    // Without a value until written: most files are only listed.
-    char names_[kNamesRoom];
-    std::byte values_[kValuesRoom];
-    Entry entries_[kMostEntries];
+    AttributeList list_;
 };
 
 } // namespace host

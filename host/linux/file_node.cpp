@@ -42,6 +42,17 @@ FileNode::~FileNode() {
         (void)indexes().attributes_changed(ref_);
 }
 
+void FileNode::believe(const KnownAttributes& attributes) {
+    if (!attributes.known)
+        return;
+    constexpr std::int64_t kSecond = 1'000'000'000;
+    const AttributeSnapshot::Moment before = recent_.moment();
+    struct stat status = {};
+    if (system_calls().fstat(descriptor_.get(), &status) == 0 && status.st_ino == attributes.inode &&
+        status.st_ctim.tv_sec * kSecond + status.st_ctim.tv_nsec == attributes.change_time)
+        recent_.take(attributes.list, before);
+}
+
 Result<NodeStat> FileNode::stat() {
     struct statx status = {};
     if (system_calls().statx(descriptor_.get(), "", AT_EMPTY_PATH | AT_NO_AUTOMOUNT, kNodeStatMask,

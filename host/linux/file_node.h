@@ -5,6 +5,7 @@
 #include "host/linux/attribute_snapshot.h"
 #include "host/linux/attribute_store.h"
 #include "host/linux/descriptor.h"
+#include "host/linux/seen_entry.h"
 #include <optional>
 
 namespace host {
@@ -22,6 +23,9 @@ class FileNode final : public Node {
 
     /// Several attributes are going to be asked for, so they are listed before the first is read.
     void expect_questions() { recent_.note_miss(); }
+    /// Believes what is known of the attributes where the open file is the one it is known of and has not
+    /// been changed since. Does nothing otherwise.
+    void believe(const KnownAttributes& attributes);
 
     Result<NodeStat> stat() override;
     Result<NodeKind> kind() override;

@@ -129,6 +129,7 @@ Result<std::unique_ptr<Node>> LinuxFileSystem::open(const EntryRef& ref, const O
             auto node =
                 std::make_unique<FileNode>(*std::move(seen), (*directory)->device(), ref, NodeKind::file);
             node->expect_questions();
+            node->believe(attributes_of_seen_file());
             return std::unique_ptr<Node>(std::move(node));
         }
     }

@@ -1,5 +1,8 @@
 #include "host/linux/seen_entry.h"
 
+#include "host/linux/attribute_marker.h"
+#include "host/linux/attribute_name.h"
+#include <algorithm>
 #include <cstring>
 #include <ctime>
 
@@ -16,6 +19,7 @@ struct SeenFile {
     std::uint64_t directory = 0;
     std::size_t leaf_size = 0;
     char leaf[kLongestLeaf];
+    KnownAttributes attributes;
 };
 
 SeenFile& seen_file() {
@@ -31,8 +35,29 @@ std::int64_t now() {
 
 } // namespace
 
+void KnownAttributes::add(std::string_view name) {
+    known = known && list.add(kAttributePrefix, name);
+}
+
+void KnownAttributes::add(std::string_view name, std::uint32_t type, std::span<const std::byte> bytes,
+                          Ending ending) {
+    add(name);
+    // A value of that type never lies on a file as it is.
+    if (!known || type == AttributeMarker::kReservedType)
+        return;
+    const std::size_t end = sizeof(type) + bytes.size();
+    const std::span<std::byte> stored = list.value_of_last(end + (ending == Ending::terminated ? 1 : 0));
+    if (stored.empty())
+        return;
+    store_big_endian(type, stored.data());
+    std::copy(bytes.begin(), bytes.end(), stored.begin() + sizeof(type));
+    if (ending == Ending::terminated)
+        stored[end] = std::byte{0};
+}
+
 void set_seen_file(const EntryRef& ref) {
     SeenFile& seen = seen_file();
+    seen.attributes.known = false;
     if (ref.leaf.empty() || ref.leaf.size() > kLongestLeaf)
         return;
     seen.time = now();
@@ -47,6 +72,10 @@ bool was_seen_as_file(const EntryRef& ref) {
     return seen.directory == ref.directory && seen.device == ref.device && !ref.leaf.empty() &&
            seen.leaf_size == ref.leaf.size() &&
            std::memcmp(seen.leaf, ref.leaf.data(), ref.leaf.size()) == 0 && now() - seen.time < kLifetime;
+}
+
+KnownAttributes& attributes_of_seen_file() {
+    return seen_file().attributes;
 }
 
 } // namespace host

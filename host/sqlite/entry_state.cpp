@@ -50,8 +50,25 @@ RecordedAttribute recorded_form(const FileAttribute& attribute) {
     return recorded;
 }
 
+bool is_recorded_exactly(const EntryState& state) {
+    // Where times are whole seconds, two changes within one have the same.
+    if (state.status.st_ctim.tv_nsec == 0 || !state.whole)
+        return false;
+    return std::ranges::all_of(state.attributes, [](const FileAttribute& attribute) {
+        const RecordedAttribute recorded = recorded_form(attribute);
+        if (recorded.cut)
+            return true;
+        // A blob may get lost without a change of the file.
+        if (attribute.spilled)
+            return false;
+        const bool is_text = kind_of_type(attribute.type) == AttributeValue::Kind::text;
+        return attribute.bytes.size() == recorded.bytes.size() + (is_text ? 1 : 0);
+    });
+}
+
 bool row_agrees(const IndexRow& row, const EntryState& state, const AttributeNames& names) {
-    if (row.inode != state.status.st_ino || row.change_time != change_time_of(state.status))
+    if (row.inode != state.status.st_ino || row.change_time != change_time_of(state.status) ||
+        (row.exact && !is_recorded_exactly(state)))
         return false;
     RecordReader reader(row.attributes);
     RecordedAttribute recorded;
@@ -70,6 +87,7 @@ bool row_agrees(const IndexRow& row, const EntryState& state, const AttributeNam
 
 Status StateReader::read(int directory, DeviceId device, const char* leaf, EntryState& state) {
     state.attributes.clear();
+    state.whole = false;
     Result<Descriptor> file = open_for_reading(directory, leaf, &state.status);
     // What this user may not read has no attributes for him.
     if (!file)
@@ -90,12 +108,13 @@ Status StateReader::read(int directory, DeviceId device, const char* leaf, Entry
             state.attributes.push_back(
                 {std::string(attribute.name), attribute.type,
                  std::string(reinterpret_cast<const char*>(attribute.bytes.data()), attribute.bytes.size()),
-                 attribute.complete});
+                 attribute.complete, attribute.spilled});
         });
         if (says_nothing_of_the_entry(scanned.error()))
             return scanned;
         if (!scanned.ok())
             state.attributes.clear();
+        state.whole = scanned.ok() && !scanner_.passed_over();
         if (system_calls().fstat(file->get(), &state.status) != 0)
             return errno;
         if (change_time_of(state.status) == before && state.status.st_ino == inode)

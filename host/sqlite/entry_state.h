@@ -24,6 +24,7 @@ struct FileAttribute {
     std::uint32_t type = 0;
     std::string bytes;
     bool complete = true; ///< false: longer than a row takes; `bytes` is then empty
+    bool spilled = false; ///< the bytes lie in a blob
 };
 
 /// What one file was at one moment: status and attributes belong to the same change time.
@@ -31,6 +32,7 @@ struct EntryState {
     struct stat status = {};
     std::vector<FileAttribute> attributes;
     bool settled = false; ///< see IndexRow
+    bool whole = true;    ///< no attribute of the file is missing
 };
 
 std::int64_t change_time_of(const struct stat& status);
@@ -41,6 +43,9 @@ bool says_nothing_of_the_entry(int error);
 
 /// The form in which a row keeps this attribute; its number is left to the caller. Borrows from `attribute`.
 RecordedAttribute recorded_form(const FileAttribute& attribute);
+
+/// What a row holds of these attributes fits the description of IndexRow::exact.
+bool is_recorded_exactly(const EntryState& state);
 
 /// The row is, apart from its place, what would be written for this state.
 bool row_agrees(const IndexRow& row, const EntryState& state, const AttributeNames& names);

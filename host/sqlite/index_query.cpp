@@ -1,6 +1,8 @@
 #include "host/sqlite/index_query.h"
+#include "host/linux/seen_entry.h"
 #include "host/linux/system_calls.h"
 #include "host/linux/volume_table.h"
+#include "host/sqlite/attribute_value.h"
 #include "host/sqlite/known_directory.h"
 #include <algorithm>
 #include <cerrno>
@@ -12,13 +14,18 @@ namespace {
 
 // So few that a query never starves the program of descriptors.
 constexpr std::size_t kHeldDirectories = 64;
+// Rows read together: few at first, so that the first hit comes soon.
+constexpr std::size_t kFirstGroup = 8;
+constexpr std::size_t kLargestGroup = 256;
 
 } // namespace
 
 IndexQuery::IndexQuery(std::shared_ptr<VolumeIndex> index, std::shared_ptr<const Condition> condition,
                        std::shared_ptr<LiveQuery> live, std::vector<RowNumber> rows)
     : index_(std::move(index)), condition_(std::move(condition)), live_(std::move(live)),
-      rows_(std::move(rows)) {}
+      rows_(std::move(rows)) {
+    condition_->collect_attributes(asked_for_);
+}
 
 IndexQuery::~IndexQuery() {
     if (live_)
@@ -43,7 +50,7 @@ const Directory* IndexQuery::directory_of(std::uint64_t inode) {
     return last_directory_ = found->second.get();
 }
 
-bool IndexQuery::is_hit(IndexRow& row, Hit& hit) {
+bool IndexQuery::is_hit(const IndexRow& row, Hit& hit) {
     const Directory* directory = directory_of(row.directory);
     struct stat status = {};
     if (directory == nullptr || system_calls().fstatat(directory->descriptor(), row.name.c_str(), &status,
@@ -66,7 +73,43 @@ bool IndexQuery::is_hit(IndexRow& row, Hit& hit) {
     hit.ref.directory = row.directory;
     hit.ref.leaf = row.name;
     hit.inode = status.st_ino;
-    return give(hit);
+    if (!give(hit))
+        return false;
+    if (S_ISREG(status.st_mode)) {
+        set_seen_file(hit.ref);
+        if (true_row && row.exact)
+            tell_attributes(row);
+    }
+    return true;
+}
+
+// Whoever asked for hits is likely to read their attributes next. A row that lacks one of those that were
+// asked for is not told: what a file lacks may be derived and written to it, so its own word is to count.
+void IndexQuery::tell_attributes(const IndexRow& row) {
+    KnownAttributes& attributes = attributes_of_seen_file();
+    attributes.known = true;
+    attributes.inode = row.inode;
+    attributes.change_time = row.change_time;
+    attributes.list.clear();
+    std::size_t met = 0;
+    RecordReader reader(row.attributes);
+    RecordedAttribute recorded;
+    while (reader.next(recorded)) {
+        const auto found = names_.find(recorded.id);
+        if (found == names_.end()) {
+            attributes.known = false;
+            return;
+        }
+        const AttributeName& name = found->second;
+        const bool is_text = kind_of_type(name.type) == AttributeValue::Kind::text;
+        met += asked_for_.contains(name.name) ? 1 : 0;
+        if (recorded.cut)
+            attributes.add(name.name);
+        else
+            attributes.add(name.name, name.type, recorded.bytes,
+                           is_text ? KnownAttributes::Ending::terminated : KnownAttributes::Ending::plain);
+    }
+    attributes.known = attributes.known && met == asked_for_.size();
 }
 
 bool IndexQuery::give(const Hit& hit) {
@@ -91,15 +134,40 @@ Status IndexQuery::next_row(Hit& hit) {
         reader_ = index_->borrow_reader();
         result = reader_ ? reader_->attributes(names_) : DatabaseResult::failed;
     }
-    while (succeeded(result) && position_ < rows_.size() && !volume_is_gone_) {
-        result = reader_->read(rows_[position_], row_);
-        if (!succeeded(result))
+    while (succeeded(result) && !volume_is_gone_) {
+        while (looked_at_ < group_ && !volume_is_gone_) {
+            if (is_hit(read_[looked_at_++], hit))
+                return {};
+        }
+        if (position_ == rows_.size())
             break;
-        ++position_;
-        if (result == DatabaseResult::row && is_hit(row_, hit))
-            return {};
+        result = read_rows();
     }
     return succeeded(result) ? Status(ENOENT) : recover(result);
+}
+
+DatabaseResult IndexQuery::read_rows() {
+    const std::size_t wanted =
+        std::min({std::max(kFirstGroup, 2 * looked_at_), kLargestGroup, rows_.size() - position_});
+    if (read_.size() < wanted)
+        read_.resize(wanted);
+    group_ = 0;
+    looked_at_ = 0;
+    DatabaseResult result = reader_->begin_reading();
+    for (const std::size_t end = position_ + wanted; succeeded(result) && position_ < end; ++position_) {
+        result = reader_->read(rows_[position_], read_[group_]);
+        if (!succeeded(result))
+            break;
+        if (result == DatabaseResult::row)
+            ++group_;
+    }
+    if (succeeded(result))
+        result = reader_->commit();
+    if (succeeded(result))
+        return DatabaseResult::done;
+    reader_->roll_back();
+    // What was read before is looked at first; then the row that cannot be read is met again.
+    return group_ > 0 ? DatabaseResult::done : result;
 }
 
 Status IndexQuery::recover(DatabaseResult result) {
@@ -110,6 +178,8 @@ Status IndexQuery::recover(DatabaseResult result) {
     const bool again = recovered_;
     recovered_ = true;
     position_ = 0;
+    group_ = 0;
+    looked_at_ = 0;
     rows_.clear();
     Status found = ENOTSUP;
     if (result == DatabaseResult::damaged && !again) {
@@ -131,6 +201,7 @@ Status IndexQuery::next(Hit& hit) {
     if (status.error() != ENOENT)
         return status;
     position_ = rows_.size();
+    group_ = 0;
     directories_.clear();
     last_directory_ = nullptr;
     if (VolumeTable::instance().refresh()->find(index_->device()) == nullptr)
@@ -148,6 +219,8 @@ Status IndexQuery::rewind() {
     last_directory_ = nullptr;
     rows_.clear();
     position_ = 0;
+    group_ = 0;
+    looked_at_ = 0;
     if (live_)
         live_->rewind();
     reader_.reset();

@@ -8,6 +8,8 @@
 #include "host/sqlite/volume_index.h"
 #include "host/sqlite/walk_query.h"
 #include <memory>
+#include <set>
+#include <string>
 #include <unordered_map>
 #include <vector>
 
@@ -25,21 +27,30 @@ class IndexQuery final : public RunningQuery {
 
   private:
     Status next_row(Hit& hit);
+    /// Reads the next rows together. `done` when there are none left.
+    DatabaseResult read_rows();
     /// The database cannot be read any further: goes on from a rebuilt index, or by a walk, without the hits
     /// that were given. EAGAIN: ask next_row() again.
     Status recover(DatabaseResult result);
     bool give(const Hit& hit);
-    bool is_hit(IndexRow& row, Hit& hit);
+    bool is_hit(const IndexRow& row, Hit& hit);
+    void tell_attributes(const IndexRow& row);
     const Directory* directory_of(std::uint64_t inode);
 
     const std::shared_ptr<VolumeIndex> index_;
     const std::shared_ptr<const Condition> condition_;
     const std::shared_ptr<LiveQuery> live_;
+    std::set<std::string> asked_for_;
     std::vector<RowNumber> rows_;
+    /// The first of rows_ that has not been read.
     std::size_t position_ = 0;
     std::unique_ptr<IndexStore> reader_;
     AttributeNames names_;
-    IndexRow row_;
+    /// The rows that were read last, of which the first `looked_at_` have been looked at. Kept longer than
+    /// `group_` says, for their memory.
+    std::vector<IndexRow> read_;
+    std::size_t group_ = 0;
+    std::size_t looked_at_ = 0;
     /// The directories of recent hits; null: not to be found.
     std::unordered_map<std::uint64_t, DirectoryCache::Handle> directories_;
     bool volume_is_gone_ = false;

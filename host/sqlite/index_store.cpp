@@ -15,6 +15,11 @@ std::uint64_t as_unsigned(std::int64_t number) {
     return static_cast<std::uint64_t>(number);
 }
 
+// The column tells both.
+std::int64_t settled_column(const IndexRow& row) {
+    return row.settled ? row.exact ? 2 : 1 : 0;
+}
+
 } // namespace
 
 DatabaseResult IndexStore::open(const std::string& path, Connection::Mode mode) {
@@ -42,6 +47,10 @@ DatabaseResult IndexStore::begin() {
     no_free_ids_ = false;
     next_id_ = 0;
     return connection_.execute("BEGIN IMMEDIATE");
+}
+
+DatabaseResult IndexStore::begin_reading() {
+    return statement("BEGIN").run();
 }
 
 DatabaseResult IndexStore::commit() {
@@ -135,7 +144,9 @@ void IndexStore::read_row(const Statement& select, IndexRow& row) {
     row.inode = as_unsigned(select.integer(3));
     row.change_time = select.integer(4);
     row.links = static_cast<std::uint32_t>(select.integer(5));
-    row.settled = select.integer(6) != 0;
+    const std::int64_t settled = select.integer(6);
+    row.settled = settled != 0;
+    row.exact = settled == 2;
 }
 
 DatabaseResult IndexStore::find(std::uint64_t directory, std::string_view name, IndexRow& row) {
@@ -245,7 +256,7 @@ DatabaseResult IndexStore::insert(IndexRow& row) {
         .bind(3, as_signed(row.inode))
         .bind(4, row.change_time)
         .bind(5, row.links)
-        .bind(6, row.settled ? 1 : 0)
+        .bind(6, settled_column(row))
         .bind_blob(7, row.attributes)
         .run();
 }
@@ -256,7 +267,7 @@ DatabaseResult IndexStore::update(const IndexRow& row) {
         .bind(0, as_signed(row.inode))
         .bind(1, row.change_time)
         .bind(2, row.links)
-        .bind(3, row.settled ? 1 : 0)
+        .bind(3, settled_column(row))
         .bind_blob(4, row.attributes)
         .bind(5, row.id)
         .run();

@@ -23,6 +23,9 @@ struct IndexRow {
     std::uint32_t links = 1;
     /// The change time was already past when the attributes were read, so no later change can carry it.
     bool settled = false;
+    /// The record names all attributes of the file, and every entry that is not cut is the attribute's whole
+    /// value, but for the one zero byte behind a text. Kept for settled rows only.
+    bool exact = false;
     std::vector<std::byte> attributes;
 };
 
@@ -50,6 +53,8 @@ class IndexStore {
     Connection& connection() { return connection_; }
 
     DatabaseResult begin();
+    /// For reading several rows: they are then of one moment, and the database's locks are taken once.
+    DatabaseResult begin_reading();
     DatabaseResult commit();
     void roll_back();
 

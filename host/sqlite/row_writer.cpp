@@ -149,6 +149,7 @@ DatabaseResult RowWriter::write_links(const IndexRow& row) {
         other.change_time = row.change_time;
         other.links = row.links;
         other.settled = row.settled;
+        other.exact = row.exact;
         changes_.push_back({other.id, false, other.attributes});
         result = store_.update(other);
     }
@@ -163,6 +164,7 @@ DatabaseResult RowWriter::write_row(const ChangeNote& note, const IndexRow* old,
     row.change_time = change_time_of(state.status);
     row.links = S_ISDIR(state.status.st_mode) ? 1 : static_cast<std::uint32_t>(state.status.st_nlink);
     row.settled = state.settled;
+    row.exact = state.settled && is_recorded_exactly(state);
     DatabaseResult result = make_record(state, row.attributes);
     if (!succeeded(result))
         return result;
@@ -173,7 +175,7 @@ DatabaseResult RowWriter::write_row(const ChangeNote& note, const IndexRow* old,
     } else {
         row.id = old->id;
         const bool same = old->inode == row.inode && old->change_time == row.change_time &&
-                          old->links == row.links && old->settled == row.settled &&
+                          old->links == row.links && old->settled == row.settled && old->exact == row.exact &&
                           old->attributes == row.attributes;
         if (same)
             return DatabaseResult::done;
