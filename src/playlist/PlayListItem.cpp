@@ -9,6 +9,7 @@
 
 #include <cmath>
 #include <cstring>
+#include <utility>
 
 namespace {
 
@@ -22,17 +23,35 @@ constexpr rgb_color kTextColor = {0, 0, 0, 255};
 
 } // namespace
 
-PlayListItem::PlayListItem(entry_ref* ref)
-    : CLVListItem(0, false, false, kMinRowHeight), mMetaData(std::make_unique<BrindleMetaData>(ref)) {}
+PlayListItem::PlayListItem(entry_ref* ref) : CLVListItem(0, false, false, kMinRowHeight) {
+    BrindleMetaData record(ref);
+    mPacked.emplace(record);
+    if (record.mCover64x64bitmap == nullptr && record.mCover16x16bitmap == nullptr)
+        return;
+    BrindleMetaData& kept = MetaData();
+    std::swap(kept.mCover64x64bitmap, record.mCover64x64bitmap);
+    std::swap(kept.mCover16x16bitmap, record.mCover16x16bitmap);
+}
 
 PlayListItem::~PlayListItem() {
+    if (mMetaData == nullptr)
+        return;
     // The record leaves its small cover to whoever shows it.
     delete mMetaData->mCover16x16bitmap;
     mMetaData->mCover16x16bitmap = nullptr;
 }
 
+BrindleMetaData& PlayListItem::MetaData() {
+    if (mMetaData == nullptr) {
+        mMetaData = std::make_unique<BrindleMetaData>();
+        mPacked->Unpack(*mMetaData);
+        mPacked.reset();
+    }
+    return *mMetaData;
+}
+
 void PlayListItem::GetRef(entry_ref* out) const {
-    *out = mMetaData->mRef;
+    *out = mPacked ? mPacked->Ref() : mMetaData->mRef;
 }
 
 void PlayListItem::Update(BView* owner, const BFont* font) {
@@ -62,6 +81,8 @@ void PlayListItem::DrawItemColumn(BView* owner, BRect columnRect, int32 columnIn
 }
 
 void PlayListItem::DrawCovers(BView* owner, BRect rect) const {
+    if (mMetaData == nullptr)
+        return;
     const BBitmap* const small = mMetaData->mCover16x16bitmap;
     if (small != nullptr && small->IsValid()) {
         rect.left += kCoverInset;
@@ -82,39 +103,44 @@ void PlayListItem::DrawCovers(BView* owner, BRect rect) const {
 const char* PlayListItem::TextOf(int32 columnIndex) const {
     switch (columnIndex) {
     case kColumnTrackNo:
-        return mMetaData->mTrackNo;
+        return mPacked ? mPacked->TextOf(PackedMetaData::kTrackNo) : mMetaData->mTrackNo;
     case kColumnTime:
-        return mMetaData->mLengthText;
+        return mPacked ? mPacked->TextOf(PackedMetaData::kLengthText) : mMetaData->mLengthText;
     case kColumnSongname:
-        return mMetaData->mSongname;
+        return mPacked ? mPacked->TextOf(PackedMetaData::kSongname) : mMetaData->mSongname;
     case kColumnArtist:
-        return mMetaData->mArtist;
+        return mPacked ? mPacked->TextOf(PackedMetaData::kArtist) : mMetaData->mArtist;
     case kColumnAlbum:
-        return mMetaData->mAlbum;
+        return mPacked ? mPacked->TextOf(PackedMetaData::kAlbum) : mMetaData->mAlbum;
     default:
         return nullptr;
     }
 }
 
+int64 PlayListItem::LengthUsec() const {
+    return mPacked ? mPacked->LengthUsec() : mMetaData->mLengthUsec;
+}
+
 int PlayListItem::CompareFunc(const CLVListItem* a, const CLVListItem* b, long sortKey) {
-    const BrindleMetaData& first = static_cast<const PlayListItem*>(a)->MetaData();
-    const BrindleMetaData& second = static_cast<const PlayListItem*>(b)->MetaData();
+    const auto& first = *static_cast<const PlayListItem*>(a);
+    const auto& second = *static_cast<const PlayListItem*>(b);
+    const auto compareTexts = [&](int32 column) {
+        return strcmp(first.TextOf(column), second.TextOf(column));
+    };
     switch (sortKey) {
     case kColumnCover:
         return 0;
     case kColumnTrackNo: {
-        const int albums = strcmp(first.mAlbum, second.mAlbum);
-        return albums != 0 ? albums : strcmp(first.mTrackNo, second.mTrackNo);
+        const int albums = compareTexts(kColumnAlbum);
+        return albums != 0 ? albums : compareTexts(kColumnTrackNo);
     }
     case kColumnTime:
-        return static_cast<int32>(static_cast<uint32>(first.mLengthUsec) -
-                                  static_cast<uint32>(second.mLengthUsec));
+        return static_cast<int32>(static_cast<uint32>(first.LengthUsec()) -
+                                  static_cast<uint32>(second.LengthUsec()));
     case kColumnSongname:
-        return strcmp(first.mSongname, second.mSongname);
     case kColumnArtist:
-        return strcmp(first.mArtist, second.mArtist);
     case kColumnAlbum:
-        return strcmp(first.mAlbum, second.mAlbum);
+        return compareTexts(static_cast<int32>(sortKey));
     default:
         return static_cast<int>(sortKey);
     }

@@ -2,11 +2,13 @@
 #pragma once
 
 #include "gui/ColumnListView/CLVListItem.h"
+#include "metadata/PackedMetaData.h"
 
 #include <EntryRef.h>
 #include <GraphicsDefs.h>
 
 #include <memory>
+#include <optional>
 
 class BrindleMetaData;
 
@@ -20,7 +22,8 @@ enum PlayListColumn : int32 {
     kColumnAlbum
 };
 
-// Owns the file's metadata, which it reads once, when it is made. Thread rule: that of BListItem.
+// Owns the file's metadata, which it reads once, when it is made. A list may have very many rows, so a row
+// without covers keeps it packed. Thread rule: that of BListItem.
 class PlayListItem : public CLVListItem {
   public:
     // Of the texts, in pixels.
@@ -32,9 +35,8 @@ class PlayListItem : public CLVListItem {
 
     // Copies the file's reference.
     void GetRef(entry_ref* out) const;
-    // The small cover in it is the row's.
-    BrindleMetaData& MetaData() { return *mMetaData; }
-    const BrindleMetaData& MetaData() const { return *mMetaData; }
+    // The whole record, which the row keeps from now on. The small cover in it is the row's.
+    BrindleMetaData& MetaData();
 
     void DrawItemColumn(BView* owner, BRect columnRect, int32 columnIndex, bool complete) override;
     void Update(BView* owner, const BFont* font) override;
@@ -48,7 +50,10 @@ class PlayListItem : public CLVListItem {
     void DrawCovers(BView* owner, BRect rect) const;
     // Null for a column without text.
     const char* TextOf(int32 columnIndex) const;
+    int64 LengthUsec() const;
 
+    // Either the one or the other.
+    std::optional<PackedMetaData> mPacked;
     std::unique_ptr<BrindleMetaData> mMetaData;
     // From the row's top to the baseline of its texts.
     float mTextOffset = 0;

@@ -86,15 +86,25 @@ TEST_F(SongOrder, ALaterColumnAnswersItsOwnNumber) {
 }
 
 TEST_F(SongOrder, IsThatOfTheTextsOnTheFiles) {
-    const std::string zulu = MakeFile("1.mp3");
-    SetText(zulu, "Audio:Songname", "Zulu");
-    const std::string alpha = MakeFile("2.mp3");
-    SetText(alpha, "Audio:Songname", "alpha");
-    entry_ref zuluRef = RefOf(zulu);
-    entry_ref alphaRef = RefOf(alpha);
-    const PlayListItem first(&zuluRef);
-    const PlayListItem second(&alphaRef);
-    EXPECT_LT(PlayListItem::CompareFunc(&first, &second, 3), 0);
+    const auto make = [](const char* name, const char* song, const char* artist, const char* trackNo) {
+        const std::string path = MakeFile(name);
+        SetText(path, "Audio:Songname", song);
+        SetText(path, "Audio:Artist", artist);
+        SetText(path, "Audio:Album", "Album");
+        SetText(path, "Audio:TrackNo", trackNo);
+        entry_ref ref = RefOf(path);
+        return std::make_unique<PlayListItem>(&ref);
+    };
+    const auto first = make("1.mp3", "Zulu", "a", "9");
+    const auto second = make("2.mp3", "alpha", "b", "10");
+    EXPECT_GT(PlayListItem::CompareFunc(first.get(), second.get(), 1), 0);
+    EXPECT_EQ(PlayListItem::CompareFunc(first.get(), second.get(), 2), 0);
+    EXPECT_LT(PlayListItem::CompareFunc(first.get(), second.get(), 3), 0);
+    EXPECT_LT(PlayListItem::CompareFunc(first.get(), second.get(), 4), 0);
+    EXPECT_EQ(PlayListItem::CompareFunc(first.get(), second.get(), 5), 0);
+    // A row whose record was asked for compares like any other.
+    CopyText(second->MetaData().mArtist, "A");
+    EXPECT_GT(PlayListItem::CompareFunc(first.get(), second.get(), 4), 0);
 }
 
 } // namespace

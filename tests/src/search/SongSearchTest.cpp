@@ -189,7 +189,7 @@ TEST_F(SongSearch, AHitThatVanishesBeforeItsRowIsMadeIsARowWithoutTexts) {
     WithWindow([&] {
         mWindow->AddToList(&ref);
         ASSERT_EQ(mWindow->List()->CountItems(), 1);
-        const auto* const row = static_cast<PlayListItem*>(mWindow->List()->ItemAt(0));
+        auto* const row = static_cast<PlayListItem*>(mWindow->List()->ItemAt(0));
         EXPECT_STREQ(row->MetaData().mSongname, "");
         EXPECT_FALSE(row->MetaData().mIsValid);
     });
