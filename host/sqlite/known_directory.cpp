@@ -1,4 +1,9 @@
 #include "host/sqlite/known_directory.h"
+#include "host/linux/opening.h"
+#include "host/linux/system_calls.h"
+#include "host/linux/volume_table.h"
+#include <cerrno>
+#include <sys/stat.h>
 
 namespace host {
 
@@ -18,6 +23,22 @@ Result<DirectoryCache::Handle> find_known_directory(IndexStore& store, DeviceId 
         at = known.parent;
     }
     return found ? found : cache.find(device, inode, DirectoryCache::Search::whole_volume);
+}
+
+Result<DirectoryCache::Handle> open_parent(const Directory& child) {
+    const auto volumes = VolumeTable::instance().current();
+    const Volume* volume = volumes->find(child.device());
+    if (volume == nullptr || volume->info.root_inode == child.inode())
+        return Status(ENOENT);
+    Result<Descriptor> parent = open_directory(child.descriptor(), "..");
+    if (!parent.ok())
+        return parent.status();
+    struct stat status = {};
+    if (system_calls().fstat(parent->get(), &status) != 0)
+        return Status(errno);
+    if (status.st_dev != child.file_system_device())
+        return Status(ENOENT);
+    return DirectoryCache::instance().adopt(*std::move(parent), child.device(), status);
 }
 
 } // namespace host

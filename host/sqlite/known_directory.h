@@ -10,4 +10,8 @@ namespace host {
 /// volume. Fails as DirectoryCache::find() does. For the thread that `store` belongs to.
 Result<DirectoryCache::Handle> find_known_directory(IndexStore& store, DeviceId device, std::uint64_t inode);
 
+/// Opens the directory above, on the same volume, into the cache. ENOENT for the volume's root, and where
+/// there is no such one.
+Result<DirectoryCache::Handle> open_parent(const Directory& child);
+
 } // namespace host

@@ -122,7 +122,9 @@ DatabaseResult RowWriter::remember_directory(std::uint64_t directory) {
         if (place->parent_device != (*handle)->file_system_device() || place->parent_inode == directory)
             return result;
         directory = place->parent_inode;
-        if (!DirectoryCache::instance().find(device_, directory, DirectoryCache::Search::hints_only))
+        // Nobody may have been shown it yet, and without it the way to those below would have to be searched.
+        if (!DirectoryCache::instance().find(device_, directory, DirectoryCache::Search::hints_only) &&
+            !open_parent(**handle))
             return result;
     }
     return DatabaseResult::done;

@@ -1,4 +1,7 @@
 #include "index_fixture.h"
+
+#include "host/linux/system_calls.h"
+#include <atomic>
 #include <fcntl.h>
 #include <mutex>
 #include <thread>
@@ -134,6 +137,34 @@ TEST_F(QueryTest, HitsSurviveRenamingTheirDirectory) {
     RunningQuery::Hit hit;
     ASSERT_TRUE((*query)->next(hit).ok());
     EXPECT_EQ(*file_system().path_of(hit.ref), root_ + "/moved/sub/one");
+}
+
+TEST_F(QueryTest, TheIndexKnowsTheWayToFoldersThatWereNeverAskedFor) {
+    class ListsCounted : public SystemCalls {
+      public:
+        ssize_t getdents(int directory, void* buffer, std::size_t size) override {
+            ++lists;
+            return SystemCalls::getdents(directory, buffer, size);
+        }
+        std::atomic<int> lists{0};
+    };
+    make("a/b/c/one");
+    make("a/b/d/two");
+    tag_outside("a/b/c/one", "A", "x");
+    tag_outside("a/b/d/two", "A", "x");
+    DirectoryCache::instance().clear();
+    ASSERT_TRUE(indexes().create(device_, "A", kText).ok());
+    ASSERT_TRUE(indexes().rebuild(device_, nullptr).ok());
+    indexes().shut_down();
+    DirectoryCache::instance().clear();
+    const auto query = indexes().query(device_, contains("A", "x"), nullptr);
+    ASSERT_TRUE(query.ok());
+    ListsCounted counting;
+    const ScopedSystemCalls scope(counting);
+    RunningQuery::Hit hit;
+    EXPECT_TRUE((*query)->next(hit).ok());
+    EXPECT_TRUE((*query)->next(hit).ok());
+    EXPECT_EQ(counting.lists, 0) << "folders were searched through";
 }
 
 TEST_F(QueryTest, RenamingThroughTheLibraryMovesTheRow) {
