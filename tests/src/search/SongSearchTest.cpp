@@ -10,8 +10,10 @@
 #include <Query.h>
 #include <String.h>
 #include <TextView.h>
+#include <Volume.h>
 
 #include <algorithm>
+#include <cstdlib>
 
 namespace {
 
@@ -194,6 +196,37 @@ TEST_F(SongSearch, AHitThatVanishesBeforeItsRowIsMadeIsARowWithoutTexts) {
         EXPECT_FALSE(row->MetaData().mIsValid);
     });
     EXPECT_EQ(Find("Gone"), Names{}) << "and is not found again";
+}
+
+TEST_F(SongSearch, AVolumeWithoutQueriesIsPassedOverThoughItAnswers) {
+    MakeSong("1.mp3", "Here");
+    const std::string before = getenv("XDG_DATA_HOME");
+    setenv("XDG_DATA_HOME", "/proc/nowhere", 1);
+    BVolume volume(RefOf(TestVolumes::Instance().Music() + "/1.mp3").device);
+    EXPECT_TRUE(volume.KnowsAttr());
+    EXPECT_FALSE(volume.KnowsQuery()) << "there is no place for an index";
+    Open();
+    EXPECT_EQ(Find("Here"), Names{});
+    BQuery query;
+    query.SetVolume(&volume);
+    PushSongsContaining(query, "Here");
+    EXPECT_EQ(query.Fetch(), B_OK);
+    entry_ref ref;
+    EXPECT_EQ(query.GetNextRef(&ref), B_OK);
+    EXPECT_STREQ(ref.name, "1.mp3");
+    EXPECT_EQ(query.GetNextRef(&ref), B_ENTRY_NOT_FOUND);
+    setenv("XDG_DATA_HOME", before.c_str(), 1);
+}
+
+TEST_F(SongSearch, AVolumeWithoutAttributesHasNoSongs) {
+    BVolume volume(RefOf(TestVolumes::Instance().WithoutAttributes() + "/net").device);
+    EXPECT_FALSE(volume.KnowsQuery());
+    BQuery query;
+    query.SetVolume(&volume);
+    PushSongsContaining(query, "");
+    EXPECT_EQ(query.Fetch(), B_OK);
+    entry_ref ref;
+    EXPECT_EQ(query.GetNextRef(&ref), B_ENTRY_NOT_FOUND);
 }
 
 TEST_F(SongSearch, AVolumeThatHasGoneEndsSilently) {
