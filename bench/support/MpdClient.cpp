@@ -46,20 +46,32 @@ std::string MpdClient::Start(const std::string& library) {
     return {};
 }
 
-std::size_t MpdClient::CountSongs(const std::string& text) {
-    const std::string command = "count \"(any contains '" + text + "')\"\n";
-    if (write(mConnection, command.data(), command.size()) != static_cast<ssize_t>(command.size()))
-        return 0;
+std::string MpdClient::Ask(const std::string& command) {
     std::string answer;
-    std::array<char, 1024> part{};
-    while (answer.find("OK\n") == std::string::npos && answer.find("ACK ") == std::string::npos) {
+    if (write(mConnection, command.data(), command.size()) != static_cast<ssize_t>(command.size()))
+        return answer;
+    std::array<char, 65536> part;
+    while (answer != "OK\n" && !answer.ends_with("\nOK\n") && !answer.starts_with("ACK ")) {
         const ssize_t size = read(mConnection, part.data(), part.size());
         if (size <= 0)
             break;
         answer.append(part.data(), static_cast<std::size_t>(size));
     }
+    return answer;
+}
+
+std::size_t MpdClient::CountSongs(const std::string& text) {
+    const std::string answer = Ask("count \"(any contains '" + text + "')\"\n");
     const std::size_t songs = answer.find("songs: ");
     return songs == std::string::npos ? 0 : std::strtoull(answer.c_str() + songs + 7, nullptr, 10);
+}
+
+std::size_t MpdClient::SearchSongs(const std::string& text) {
+    const std::string answer = Ask("search \"(any contains '" + text + "')\"\n");
+    std::size_t songs = answer.starts_with("file: ") ? 1 : 0;
+    for (std::size_t at = 0; (at = answer.find("\nfile: ", at)) != std::string::npos; ++at)
+        ++songs;
+    return songs;
 }
 
 } // namespace bench

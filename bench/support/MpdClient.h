@@ -19,8 +19,13 @@ class MpdClient {
 
     /// The answer to count "(any contains 'TEXT')" over the connection; TEXT without quotes and backslashes.
     std::size_t CountSongs(const std::string& text);
+    /// The same by search, which answers with all that is known of each song.
+    std::size_t SearchSongs(const std::string& text);
 
   private:
+    /// The answer to a command with its newline, whole, or what came before the connection broke.
+    std::string Ask(const std::string& command);
+
     const std::string mScript;
     const std::string mFolder;
     double mSeconds = 0;
