@@ -10,7 +10,9 @@ set(QUIRNEL_SANITIZE "" CACHE STRING "Sanitizers for all of our code: empty, 'ad
 
 find_program(QUIRNEL_CCACHE ccache)
 if(QUIRNEL_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
-  set(CMAKE_CXX_COMPILER_LAUNCHER "${QUIRNEL_CCACHE}")
+  # One cache for every checkout, wherever it lies.
+  set(CMAKE_CXX_COMPILER_LAUNCHER "${CMAKE_COMMAND}" -E env
+    CCACHE_NOHASHDIR=1 "CCACHE_BASEDIR=${PROJECT_SOURCE_DIR}" "${QUIRNEL_CCACHE}")
 endif()
 
 # ccache keeps single files and cannot always keep what was compiled with a precompiled header.
