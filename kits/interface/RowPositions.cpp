@@ -1,6 +1,7 @@
 #include "RowPositions.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <iterator>
 #include <numeric>
 
@@ -23,9 +24,15 @@ size_t RowPositions::BlockOf(int32 row) const {
     return static_cast<size_t>(behind - mBlocks.begin()) - 1;
 }
 
+// From the nearer end of its block: the last row, behind which the next is appended, is asked for most.
 int64 RowPositions::TopOf(int32 row) const {
     const Block& block = mBlocks[BlockOf(row)];
-    return block.top + Sum(block.heights.begin(), block.heights.begin() + (row - block.firstRow));
+    const auto offset = static_cast<size_t>(row - block.firstRow);
+    const auto at = block.heights.begin() + static_cast<std::ptrdiff_t>(offset);
+    if (offset > block.heights.size() / 2) {
+        return block.top + block.height - Sum(at, block.heights.end());
+    }
+    return block.top + Sum(block.heights.begin(), at);
 }
 
 int32 RowPositions::HeightOf(int32 row) const {
