@@ -22,9 +22,16 @@ namespace {
 
 constexpr std::uint32_t kEvents = IN_ATTRIB | IN_CLOSE_WRITE | IN_CREATE | IN_DELETE | IN_MOVED_FROM |
                                   IN_MOVED_TO | IN_ONLYDIR | IN_EXCL_UNLINK;
+constexpr std::uint32_t kAllButAttributes = kEvents & ~static_cast<std::uint32_t>(IN_ATTRIB);
 constexpr int kDeepest = 200;
 // Milliseconds.
 constexpr int kNap = 50;
+
+// The number of the watch, or negative.
+int add_watch(int notifications, int directory, std::uint32_t events) {
+    const std::string path = "/proc/self/fd/" + std::to_string(directory);
+    return inotify_add_watch(notifications, path.c_str(), events);
+}
 
 } // namespace
 
@@ -57,12 +64,22 @@ void ChangeWatcher::watch(int directory, std::uint64_t inode) {
         say_limit_once();
         return;
     }
-    const std::string path = "/proc/self/fd/" + std::to_string(directory);
-    const int number = inotify_add_watch(notifications_.get(), path.c_str(), kEvents);
+    const int number = add_watch(notifications_.get(), directory, kEvents);
     if (number >= 0)
         directories_[number] = inode;
     else if (errno == ENOSPC || errno == EMFILE || errno == ENOMEM || errno == EBADF)
         say_limit_once();
+}
+
+bool ChangeWatcher::watch_directory(int directory, Scope scope) {
+    if (scope == Scope::everything) {
+        const bool watched = add_watch(notifications_.get(), directory, kEvents) >= 0;
+        // Somebody took away this user's right to read it: looked at from time to time, as with too many.
+        if (!watched)
+            limited_ = true;
+        return watched;
+    }
+    return complete_ && !limited_ && add_watch(notifications_.get(), directory, kAllButAttributes) >= 0;
 }
 
 void ChangeWatcher::add_all() {

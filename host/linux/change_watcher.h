@@ -44,6 +44,12 @@ class ChangeWatcher {
     /// All directories were reached, watched or not.
     bool is_complete() const { return complete_.load(); }
 
+    /// What the watch of a directory tells from now on. Any thread; the directory lies on the volume and is
+    /// open. False: its watch is as it was; `all_but_attributes` is refused while not all directories are
+    /// watched.
+    enum class Scope { everything, all_but_attributes };
+    [[nodiscard]] bool watch_directory(int directory, Scope scope);
+
   private:
     void run();
     void add_all();
@@ -60,7 +66,7 @@ class ChangeWatcher {
     Descriptor wake_;
     std::atomic<bool> stopping_{false};
     std::atomic<bool> complete_{false};
-    bool limited_ = false;
+    std::atomic<bool> limited_{false};
     /// Watch to inode of its directory.
     std::unordered_map<int, std::uint64_t> directories_;
     std::thread thread_;

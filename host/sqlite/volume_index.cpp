@@ -11,9 +11,6 @@
 namespace host {
 namespace {
 
-constexpr int kRetrySteps = 100;
-constexpr std::chrono::milliseconds kRetryStep{100};
-
 std::int64_t now() {
     return std::chrono::duration_cast<std::chrono::nanoseconds>(
                std::chrono::system_clock::now().time_since_epoch())
@@ -23,7 +20,8 @@ std::int64_t now() {
 } // namespace
 
 VolumeIndex::VolumeIndex(DeviceId device, const std::string& stable_key)
-    : device_(device), stable_key_(stable_key), files_(stable_key), writer_(device, store_) {}
+    : device_(device), stable_key_(stable_key), files_(stable_key), own_work_(device),
+      writer_(device, store_) {}
 
 VolumeIndex::~VolumeIndex() {
     stopping_ = true;
@@ -31,6 +29,7 @@ VolumeIndex::~VolumeIndex() {
     std::unique_ptr<ChangeWatcher> watcher;
     {
         MutexLock lock(watcher_mutex_);
+        own_work_.follow(nullptr);
         watcher = std::move(watcher_);
     }
     // Its thread may be about to start a walk.
@@ -251,6 +250,7 @@ ChangeTicket VolumeIndex::attributes_changed(const EntryRef& ref) {
             changes_missed_ = true;
         return {};
     }
+    own_work_.changed_in(ref.directory, queue_.reported());
     return queue_.put(ref.directory, ref.leaf, ChangeNote::Source::own);
 }
 
@@ -268,6 +268,8 @@ void VolumeIndex::write_groups() {
     std::vector<ChangeNote> group;
     std::uint64_t position = 0;
     while (queue_.take(group, position)) {
+        if (!own_work_.look_over(group, position, queue_.reported()))
+            reconcile_in_background();
         bool written = write_group(group);
         if (queue_.overflowed()) {
             MutexLock lock(mutex_);
@@ -367,19 +369,6 @@ WriterStatistics VolumeIndex::statistics() {
     return writer_.statistics();
 }
 
-void VolumeIndex::work_in_background() {
-    Status status;
-    do {
-        // Somebody who could not wait may have walked already.
-        if (!reconcile_wanted_.exchange(false) && is_complete())
-            return;
-        status = walk_volume(Looking::changed_only, nullptr, nullptr, Ground::back);
-        // The database could not be written: a full disk has time to be seen to.
-        for (int i = 0; status.error() == ENOTSUP && i < kRetrySteps && !stopping_; ++i)
-            std::this_thread::sleep_for(kRetryStep);
-    } while (!stopping_ && (reconcile_wanted_ || status.error() == EAGAIN || status.error() == ENOTSUP));
-}
-
 void VolumeIndex::follow() {
     MutexLock lock(watcher_mutex_);
     if (watcher_ || stopping_)
@@ -390,11 +379,10 @@ void VolumeIndex::follow() {
     };
     sink.changes_missed = [this] { reconcile_in_background(); };
     watcher_ = std::make_unique<ChangeWatcher>(device_, std::move(sink));
-}
-
-void VolumeIndex::reconcile_in_background() {
-    reconcile_wanted_ = true;
-    background_.start();
+    // The change times of files over a network come from another machine's clock.
+    const Result<VolumeInfo> info = VolumeTable::instance().info(device_);
+    if (info && !info->shared)
+        own_work_.follow(watcher_.get());
 }
 
 } // namespace host

@@ -7,6 +7,7 @@
 #include "host/sqlite/change_queue.h"
 #include "host/sqlite/index_files.h"
 #include "host/sqlite/live_queries.h"
+#include "host/sqlite/own_work.h"
 #include "host/sqlite/reader_pool.h"
 #include "host/sqlite/row_writer.h"
 #include "host/sqlite/search_columns.h"
@@ -113,6 +114,7 @@ class VolumeIndex {
     const IndexFiles files_;
     SharedSlots slots_;
     ChangeQueue queue_;
+    OwnWork own_work_;
     std::atomic<bool> reconcile_wanted_{false};
     SearchColumns columns_{files_.database()};
     LiveQueries live_;

@@ -17,6 +17,8 @@ namespace host {
 namespace {
 
 constexpr std::uint64_t kProgressStep = 2000;
+constexpr int kRetrySteps = 100;
+constexpr std::chrono::milliseconds kRetryStep{100};
 // Clocks of files are coarser than ours.
 constexpr std::int64_t kClockSlack = 1'000'000'000;
 
@@ -366,6 +368,24 @@ Status VolumeIndex::rebuild(const std::function<bool(std::uint64_t)>& progress) 
     const auto report = progress ? progress : [](std::uint64_t) { return true; };
     const Status status = walk_volume(Looking::everything, nullptr, report);
     return status.error() == EAGAIN || status.error() == ENOTSUP ? Status() : status;
+}
+
+void VolumeIndex::work_in_background() {
+    Status status;
+    do {
+        // Somebody who could not wait may have walked already.
+        if (!reconcile_wanted_.exchange(false) && is_complete())
+            return;
+        status = walk_volume(Looking::changed_only, nullptr, nullptr, Ground::back);
+        // The database could not be written: a full disk has time to be seen to.
+        for (int i = 0; status.error() == ENOTSUP && i < kRetrySteps && !stopping_; ++i)
+            std::this_thread::sleep_for(kRetryStep);
+    } while (!stopping_ && (reconcile_wanted_ || status.error() == EAGAIN || status.error() == ENOTSUP));
+}
+
+void VolumeIndex::reconcile_in_background() {
+    reconcile_wanted_ = true;
+    background_.start();
 }
 
 } // namespace host
