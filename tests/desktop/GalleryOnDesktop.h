@@ -47,10 +47,10 @@ class GalleryOnDesktop : public WindowOnDesktop {
         const BAutolock lock(mWindow);
         return function();
     }
-    // Waits for it, five seconds at most.
+    // Waits for it, half a minute at most.
     template <typename Function>
     bool Comes(Function condition) {
-        for (int i = 0; i < 100 && !Read(condition); ++i) {
+        for (int i = 0; i < 600 && !Read(condition); ++i) {
             snooze(50000);
         }
         return Read(condition);

@@ -127,9 +127,11 @@ TEST_F(ProgramOnDesktop, TheDesktopEntrysCommandsRunAsTheyAreWritten) {
             EXPECT_EQ(result.output + result.errors, "") << commands[i];
             EXPECT_TRUE(Comes([] { return CountWindows() == 1; })) << commands[i];
         }
-        usleep(500000);
         // Both main windows, as at any first start, and the playlist where it was asked for.
-        EXPECT_EQ(CountAllWindows(), commands[i].ends_with("103") ? 3 : 2) << commands[i];
+        const int windows = commands[i].ends_with("103") ? 3 : 2;
+        EXPECT_TRUE(Comes([&] { return CountAllWindows() == windows; })) << commands[i];
+        usleep(500000);
+        EXPECT_EQ(CountAllWindows(), windows) << commands[i];
         EXPECT_TRUE(EndLaunched()) << commands[i];
     }
 }

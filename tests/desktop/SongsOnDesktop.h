@@ -46,12 +46,21 @@ class SongsOnDesktop : public Indexer {
     }
     static Paths Played() { return test::lines_of(test::read_file(Home() + "/played")); }
     static Paths Shown() { return test::lines_of(test::read_file(Home() + "/shown")); }
-    // What the player gets by what `use` does; nothing in two seconds counts as nothing.
+    // What the player gets by what `use` does.
     template <typename Use>
     static Paths PlayedBy(Use use) {
+        return PlayedWithin(20, use);
+    }
+    // Nothing in two seconds counts as nothing.
+    template <typename Use>
+    static bool NothingIsPlayedBy(Use use) {
+        return PlayedWithin(2, use).empty();
+    }
+    template <typename Use>
+    static Paths PlayedWithin(int seconds, Use use) {
         ForgetOpened();
         use();
-        for (int i = 0; i < 20 && Played().empty(); ++i)
+        for (int i = 0; i < 10 * seconds && Played().empty(); ++i)
             usleep(100000);
         usleep(300000);
         return Played();

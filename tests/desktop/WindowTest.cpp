@@ -147,7 +147,7 @@ TEST_F(WindowTest, SizesDownToOnePixelWhileItDrawsDoNoHarm) {
         for (const int side : {1, 700, 2, 33, 1, 500, 1, 301}) {
             TheDesktop().tool({"windowsize", id, std::to_string(side), std::to_string(side)});
         }
-        for (int i = 0; i < 50 && FrameOf(window).Width() != 300; ++i) {
+        for (int i = 0; i < 300 && FrameOf(window).Width() != 300; ++i) {
             snooze(100000);
         }
         done = true;
@@ -189,7 +189,7 @@ TEST_F(WindowTest, ZoomingByTheTitleStaysWithinTheZoomLimits) {
         window->Unlock();
         TheDesktop().move_pointer(450, 190);
         TheDesktop().tool({"click", "--repeat", "2", "--delay", "80", "1"});
-        for (int i = 0; i < 50 && FrameOf(window).Height() < 900; ++i) {
+        for (int i = 0; i < 300 && FrameOf(window).Height() < 900; ++i) {
             snooze(100000);
         }
         snooze(500000);

@@ -171,7 +171,7 @@ std::uint32_t Desktop::pixel(int x, int y) const {
 }
 
 bool Desktop::becomes(int x, int y, std::uint32_t color) const {
-    for (int i = 0; i < 50; ++i) {
+    for (int i = 0; i < 300; ++i) {
         if (pixel(x, y) == color)
             return true;
         pause_for(100);

@@ -38,7 +38,7 @@ class Desktop {
 
     /// 0xRRGGBB, as shown at the moment.
     std::uint32_t pixel(int x, int y) const;
-    /// Whether the pixel gets that colour within some seconds.
+    /// Whether the pixel gets that colour within half a minute or so.
     bool becomes(int x, int y, std::uint32_t color) const;
     void screenshot(const std::string& path) const;
 

@@ -58,7 +58,10 @@ TEST_F(Surroundings, AJobUnderNohupSurvivesTheHangUp) {
     for (int i = 0; i < 3000; ++i)
         Touch("Oak - Leaf " + std::to_string(i) + ".mp3");
     test::Program program("/bin/sh", {"-c", "trap '' HUP; exec \"$0\" index", QUIRNELCTL});
-    usleep(100'000);
+    // The shell has set the trap when it is the job.
+    const std::string name = "/proc/" + std::to_string(program.process()) + "/comm";
+    for (int i = 0; i < 30'000 && test::read_file(name) != "quirnelctl\n"; ++i)
+        usleep(1'000);
 
     program.signal(SIGHUP);
 

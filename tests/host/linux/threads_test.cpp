@@ -59,7 +59,7 @@ TEST(threads_test, an_ended_thread_is_refused) {
     host::native_thread ended = 0;
     in_a_thread([&ended] { ended = host::current_native_thread(); });
     // The system removes a joined thread a moment later.
-    for (int attempt = 0; attempt < 1000 && !host::thread_name(ended).empty(); attempt++)
+    for (int attempt = 0; attempt < 10000 && !host::thread_name(ended).empty(); attempt++)
         std::this_thread::sleep_for(std::chrono::milliseconds(1));
     EXPECT_FALSE(host::set_thread_name(ended, "x"));
     EXPECT_EQ(host::thread_name(ended), "");

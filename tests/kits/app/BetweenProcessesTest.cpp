@@ -236,7 +236,9 @@ TEST_F(BetweenProcessesTest, APeerThatIsStoppedHoldsNobodyUpBeyondTheTimeOut) {
     large.AddData("bytes", B_RAW_TYPE, bytes.data(), static_cast<ssize_t>(bytes.size()));
     BMessage small('numb');
     small.AddInt32("number", 0);
-    snooze(kSecond / 5);
+    const std::string status = "/proc/" + std::to_string(peer.Process().process()) + "/status";
+    ASSERT_TRUE(test::Eventually(
+        [&] { return test::read_file(status).find("State:\tT (stopped)") != std::string::npos; }));
     const bigtime_t before = system_time();
     EXPECT_EQ(peer.Messenger().SendMessage(&large, BMessenger(), kSecond / 2), B_TIMED_OUT);
     EXPECT_EQ(peer.Messenger().SendMessage(&small, BMessenger(), kSecond / 2), B_TIMED_OUT);
