@@ -104,6 +104,10 @@ bool ReportFrames(const std::string& what, const FrameCosts& costs, const FrameL
     reached &= Report(what + "slowest", frames.back(), "ms", limits.name, limits.slowest, 1, Better::lower);
     PrintSpread("frames", costs.frames, time);
     PrintSpread("arithmetic", costs.arithmetic, time);
+    if (PartAt(frames, 0.95) > limits.slowest) {
+        std::fflush(stdout);
+        return false;
+    }
     int slow = 0;
     for (std::size_t i = 0; i < costs.frames.size(); ++i) {
         const FrameCost& cost = costs.frames[i];

@@ -40,7 +40,7 @@ struct FrameLimits {
 
 /// Prints the 95th percentile and the slowest frame beside their limits, and the same of the arithmetic. Each
 /// frame that is too slow, up to ten, is drawn again after the frames that came before it: work of ours is as
-/// slow then.
+/// slow then. (Not where more than one in twenty is too slow: then all are.)
 /// Answers whether both limits are kept.
 bool ReportFrames(const std::string& what, const FrameCosts& costs, const FrameLimits& limits, Time time,
                   const std::function<void(int)>& draw);
