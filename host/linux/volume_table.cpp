@@ -68,24 +68,48 @@ struct VolumeTable::Sources {
 
         const DeclaredVolumes old_declared = std::exchange(declared, read_declared_volumes());
         const std::vector<Identity> old_identities = std::exchange(declared_identities, {});
-        for (const std::string& path : declared.paths) {
-            struct stat status = {};
-            const bool there = system_calls().fstatat(AT_FDCWD, path.c_str(), &status, 0) == 0;
-            declared_identities.push_back(there ? Identity{status.st_dev, status.st_ino} : Identity{});
-        }
+        for (const std::string& path : declared.paths)
+            declared_identities.push_back(identity_of(path));
         changed |= old_declared != declared || old_identities != declared_identities;
-        return mounts_changed() || changed;
+        const bool mounted = mounts_changed();
+        mounts_moved = false;
+        return mounted || changed;
+    }
+
+    /// Whether what was seen last still holds for this volume. Others are not looked at.
+    bool holds_for(const Volume& volume) {
+        if (!environment_is_current() || host::data_directory() != data_directory ||
+            read_declared_volumes() != declared || mounts_changed())
+            return false;
+        const Identity wanted = {volume.file_system_device, static_cast<ino_t>(volume.info.root_inode)};
+        const auto found = std::ranges::find(declared_identities, wanted);
+        // What is mounted is told by the mounts.
+        if (found == declared_identities.end())
+            return true;
+        const auto place = static_cast<std::size_t>(found - declared_identities.begin());
+        return identity_of(declared.paths[place]) == wanted;
     }
 
   private:
+    static Identity identity_of(const std::string& path) {
+        struct stat status = {};
+        return system_calls().fstatat(AT_FDCWD, path.c_str(), &status, 0) == 0
+                   ? Identity{status.st_dev, status.st_ino}
+                   : Identity{};
+    }
+    /// The system says it once, so it stands until everything has been looked at again.
     bool mounts_changed() {
         if (!mounts.valid()) {
             mounts = Descriptor(::open("/proc/self/mountinfo", O_RDONLY | O_CLOEXEC));
-            return mounts.valid();
+            mounts_moved |= mounts.valid();
+            return mounts_moved;
         }
         struct pollfd watched = {mounts.get(), POLLPRI, 0};
-        return ::poll(&watched, 1, 0) > 0;
+        mounts_moved |= ::poll(&watched, 1, 0) > 0;
+        return mounts_moved;
     }
+
+    bool mounts_moved = false;
 };
 
 namespace {
@@ -182,8 +206,18 @@ std::vector<DeviceId> VolumeTable::list() {
     return ids;
 }
 
+std::shared_ptr<const VolumeSnapshot> VolumeTable::refresh_for(DeviceId id) {
+    {
+        MutexLock lock(mutex_);
+        const Volume* volume = snapshot_->find(id);
+        if (volume != nullptr && sources_->holds_for(*volume))
+            return snapshot_;
+    }
+    return refresh();
+}
+
 Result<VolumeInfo> VolumeTable::info(DeviceId id) {
-    const auto snapshot = refresh();
+    const auto snapshot = refresh_for(id);
     const Volume* volume = snapshot->find(id);
     if (volume == nullptr)
         return Status(ENODEV);

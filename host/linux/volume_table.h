@@ -15,8 +15,9 @@ namespace host {
 
 class VolumeWatcher;
 
-/// The volumes of this machine. list(), info(), volume_of() and refresh() look whether environment, volumes
-/// file, declared directories or mounts have changed; current() does not.
+/// The volumes of this machine. list(), volume_of() and refresh() look whether environment, volumes file,
+/// declared directories or mounts have changed; info() of all directories at that volume's only; current() at
+/// none of this.
 ///
 /// Keeps no descriptor open on any volume, so that nothing keeps one from being unmounted.
 class VolumeTable final : public Volumes {
@@ -52,7 +53,8 @@ class VolumeTable final : public Volumes {
 
     VolumeTable();
     ~VolumeTable() override;
-    std::shared_ptr<const VolumeSnapshot> refresh_locked() REQUIRES(mutex_);
+    /// After looking again where something about this volume may have changed. Never null.
+    std::shared_ptr<const VolumeSnapshot> refresh_for(DeviceId volume);
 
     Mutex mutex_;
     std::unique_ptr<Sources> sources_ GUARDED_BY(mutex_);

@@ -1,8 +1,10 @@
 #include "host/linux/volume_table.h"
 
+#include "host/linux/system_calls.h"
 #include "support/attribute_file.h"
 #include "support/loop_volume.h"
 #include "support/temporary_environment.h"
+#include <algorithm>
 #include <condition_variable>
 #include <fcntl.h>
 #include <filesystem>
@@ -88,6 +90,74 @@ TEST_F(VolumeTableTest, ADeclaredDirectoryIsAVolumeAsSoonAsItExists) {
     std::filesystem::remove(later);
     EXPECT_TRUE(volumes().list().empty());
     EXPECT_EQ(volumes().info(id).error(), ENODEV);
+}
+
+/// The paths that are looked at from outside.
+class LookedAt final : public SystemCalls {
+  public:
+    int fstatat(int directory, const char* path, struct stat* result, int flags) override {
+        {
+            const std::lock_guard lock(mutex_);
+            paths_.emplace_back(path);
+        }
+        return SystemCalls::fstatat(directory, path, result, flags);
+    }
+    bool has(const std::string& path) {
+        const std::lock_guard lock(mutex_);
+        return std::ranges::find(paths_, path) != paths_.end();
+    }
+
+  private:
+    std::mutex mutex_;
+    std::vector<std::string> paths_;
+};
+
+TEST_F(VolumeTableTest, WhoAsksForOneVolumeHasNoOtherLookedAt) {
+    const std::string first = make_directory(environment_.root() + "/first");
+    const std::string second = make_directory(environment_.root() + "/second");
+    const std::string third = make_directory(environment_.root() + "/third");
+    environment_.declare_volumes(first + ":" + second + ":" + third);
+    const std::vector<DeviceId> ids = volumes().list();
+    ASSERT_EQ(ids.size(), 3u);
+
+    LookedAt looked_at;
+    const ScopedSystemCalls scope(looked_at);
+    EXPECT_EQ(volumes().info(ids[1])->root, second);
+    EXPECT_TRUE(looked_at.has(second));
+    EXPECT_FALSE(looked_at.has(first));
+    EXPECT_FALSE(looked_at.has(third));
+}
+
+TEST_F(VolumeTableTest, OthersThatChangedAreSeenAfterOneWasAskedFor) {
+    const std::string stays = make_directory(environment_.root() + "/stays");
+    const std::string goes = make_directory(environment_.root() + "/goes");
+    const std::string comes = environment_.root() + "/comes";
+    const std::string waits = make_directory(environment_.root() + "/waits");
+    environment_.declare_volumes(stays + ":" + goes + ":" + comes);
+    const std::vector<DeviceId> ids = volumes().list();
+    ASSERT_EQ(ids.size(), 2u);
+
+    std::filesystem::remove(goes);
+    // Not made now: it would get the other's inode.
+    std::filesystem::rename(waits, comes);
+    EXPECT_EQ(volumes().info(ids[0])->root, stays);
+    EXPECT_EQ(volumes().info(ids[1]).error(), ENODEV);
+    const std::vector<DeviceId> now = volumes().list();
+    ASSERT_EQ(now.size(), 2u);
+    EXPECT_EQ(now[0], ids[0]);
+    EXPECT_EQ(volumes().info(now[1])->root, comes);
+}
+
+TEST_F(VolumeTableTest, AnotherDirectoryInItsPlaceIsAnotherVolume) {
+    const std::string place = make_directory(environment_.root() + "/place");
+    environment_.declare_volumes(place);
+    const DeviceId before = volumes().list().at(0);
+    EXPECT_TRUE(volumes().info(before).ok());
+
+    std::filesystem::rename(place, environment_.root() + "/elsewhere");
+    make_directory(place);
+    EXPECT_EQ(volumes().info(before).error(), ENODEV);
+    EXPECT_NE(volumes().list().at(0), before);
 }
 
 TEST_F(VolumeTableTest, TheDeepestVolumeAnswersForAPath) {
