@@ -154,6 +154,10 @@ TEST_F(Texts, TheMouseSetsTheCaretAndSelects) {
 
 TEST_F(Texts, CutCopyAndPasteExchangePlainText) {
     BClipboard clipboard("test of text views");
+    ASSERT_TRUE(clipboard.Lock());
+    clipboard.Clear();
+    clipboard.Commit();
+    clipboard.Unlock();
     SetText("one two three");
     mStage.Locked([&] {
         EXPECT_FALSE(mView->AcceptsPaste(&clipboard));
