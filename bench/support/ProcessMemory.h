@@ -2,6 +2,7 @@
 
 #include <cstdlib>
 #include <fstream>
+#include <malloc.h>
 #include <string>
 
 namespace bench {
@@ -18,6 +19,12 @@ inline double StatusBytes(const std::string& field) {
 
 inline double ResidentBytes() {
     return StatusBytes("VmRSS");
+}
+
+/// Allocated and not freed, the allocator's own share included; what it holds in reserve is not.
+inline double AllocatedBytes() {
+    const struct mallinfo2 info = mallinfo2();
+    return static_cast<double>(info.uordblks + info.hblkhd);
 }
 
 } // namespace bench
