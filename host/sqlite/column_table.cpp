@@ -32,7 +32,7 @@ std::set<std::string> ColumnTable::attributes() const {
     return result;
 }
 
-void ColumnTable::set_names(const std::map<std::uint32_t, AttributeName>& names) {
+void ColumnTable::set_names(const std::map<std::uint32_t, AttributeNameAndType>& names) {
     if (&names != &names_)
         names_ = names;
     targets_.clear();

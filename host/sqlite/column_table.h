@@ -28,7 +28,7 @@ class ColumnTable {
     std::set<std::string> attributes() const;
 
     /// Which attribute the numbers in records mean; may be called again with more.
-    void set_names(const std::map<std::uint32_t, AttributeName>& names);
+    void set_names(const std::map<std::uint32_t, AttributeNameAndType>& names);
     bool knows(std::uint32_t attribute_id) const;
 
     /// The row's attributes from now on.
@@ -66,7 +66,7 @@ class ColumnTable {
 
     std::map<std::string, std::unique_ptr<Columns>> columns_;
     std::vector<Target> targets_;
-    std::map<std::uint32_t, AttributeName> names_;
+    std::map<std::uint32_t, AttributeNameAndType> names_;
     RowNumber largest_ = 0;
 };
 

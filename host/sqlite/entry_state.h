@@ -16,7 +16,7 @@
 
 namespace host {
 
-using AttributeNames = std::map<std::uint32_t, AttributeName>;
+using AttributeNames = std::map<std::uint32_t, AttributeNameAndType>;
 
 /// An attribute read from a file, kept.
 struct FileAttribute {

@@ -100,7 +100,7 @@ void IndexQuery::tell_attributes(const IndexRow& row) {
             attributes.known = false;
             return;
         }
-        const AttributeName& name = found->second;
+        const AttributeNameAndType& name = found->second;
         const bool is_text = kind_of_type(name.type) == AttributeValue::Kind::text;
         met += asked_for_.contains(name.name) ? 1 : 0;
         if (recorded.cut)

@@ -111,7 +111,7 @@ DatabaseResult IndexStore::remove_index(const std::string& attribute) {
     return statement("DELETE FROM index_list WHERE attribute = ?").bind_text(0, attribute).run();
 }
 
-DatabaseResult IndexStore::attributes(std::map<std::uint32_t, AttributeName>& names) {
+DatabaseResult IndexStore::attributes(std::map<std::uint32_t, AttributeNameAndType>& names) {
     Statement& select = statement("SELECT id, name, type FROM attribute");
     DatabaseResult result = DatabaseResult::done;
     names.clear();

@@ -36,7 +36,7 @@ struct ListedIndex {
 };
 
 /// Which attribute names and types the numbers in records stand for.
-struct AttributeName {
+struct AttributeNameAndType {
     std::string name;
     std::uint32_t type = 0;
 };
@@ -68,7 +68,7 @@ class IndexStore {
     DatabaseResult remove_index(const std::string& attribute);
 
     /// All attribute numbers, by number.
-    DatabaseResult attributes(std::map<std::uint32_t, AttributeName>& result);
+    DatabaseResult attributes(std::map<std::uint32_t, AttributeNameAndType>& result);
     /// The number of an attribute, newly given where it has none.
     DatabaseResult attribute_id(std::string_view name, std::uint32_t type, std::uint32_t& id);
 

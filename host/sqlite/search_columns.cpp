@@ -46,7 +46,7 @@ DatabaseResult SearchColumns::load(IndexStore& store, const std::set<std::string
     std::set<std::string> all = table_.attributes();
     all.insert(attributes.begin(), attributes.end());
     table_.remove_all();
-    std::map<std::uint32_t, AttributeName> names;
+    std::map<std::uint32_t, AttributeNameAndType> names;
     // Rows that are committed during the scan are read again by the catch-up that follows.
     std::int64_t sequence = 0;
     RowNumber largest = 0;
@@ -103,7 +103,7 @@ DatabaseResult SearchColumns::catch_up(IndexStore& store) {
         return load(store, {});
     if (last == seen_)
         return result;
-    std::map<std::uint32_t, AttributeName> names;
+    std::map<std::uint32_t, AttributeNameAndType> names;
     result = store.attributes(names);
     if (!succeeded(result))
         return result;
@@ -131,7 +131,7 @@ void SearchColumns::apply(IndexStore& store, const std::vector<RowChange>& chang
         (void)catch_up(store);
         return;
     }
-    std::map<std::uint32_t, AttributeName> names;
+    std::map<std::uint32_t, AttributeNameAndType> names;
     if (!succeeded(store.attributes(names)))
         return;
     table_.set_names(names);
