@@ -41,7 +41,7 @@ const Directory* IndexQuery::directory_of(std::uint64_t inode) {
     if (found == directories_.end()) {
         if (directories_.size() >= kHeldDirectories)
             directories_.clear();
-        const auto handle = find_known_directory(*reader_, index_->device(), inode);
+        const auto handle = find_known_directory(*reader_, index_->device(), inode, searched_in_vain_);
         if (!handle)
             volume_is_gone_ = VolumeTable::instance().refresh()->find(index_->device()) == nullptr;
         found = directories_.emplace(inode, handle ? *handle : nullptr).first;

@@ -56,6 +56,7 @@ class IndexQuery final : public RunningQuery {
     bool volume_is_gone_ = false;
     std::uint64_t last_inode_ = 0;
     const Directory* last_directory_ = nullptr;
+    bool searched_in_vain_ = false;
     /// Fingerprints of the hits that were given.
     std::vector<std::uint64_t> given_;
     /// So many of them, sorted, were given before the database was given up; they are not given again.

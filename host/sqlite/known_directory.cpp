@@ -7,7 +7,8 @@
 
 namespace host {
 
-Result<DirectoryCache::Handle> find_known_directory(IndexStore& store, DeviceId device, std::uint64_t inode) {
+Result<DirectoryCache::Handle> find_known_directory(IndexStore& store, DeviceId device, std::uint64_t inode,
+                                                    bool& searched_in_vain) {
     DirectoryCache& cache = DirectoryCache::instance();
     Result<DirectoryCache::Handle> found = cache.find(device, inode, DirectoryCache::Search::hints_only);
     // Upwards, until one of them is found; no farther than paths are deep.
@@ -22,7 +23,11 @@ Result<DirectoryCache::Handle> find_known_directory(IndexStore& store, DeviceId 
             break;
         at = known.parent;
     }
-    return found ? found : cache.find(device, inode, DirectoryCache::Search::whole_volume);
+    if (found || found.error() != ENOENT || searched_in_vain)
+        return found;
+    found = cache.find(device, inode, DirectoryCache::Search::whole_volume);
+    searched_in_vain = !found && found.error() == ENOENT;
+    return found;
 }
 
 Result<DirectoryCache::Handle> open_parent(const Directory& child) {

@@ -22,7 +22,7 @@ DirectoryCache::Handle RowWriter::find_directory(const ChangeNote& note) {
     const auto found =
         note.source == ChangeNote::Source::vanished
             ? DirectoryCache::instance().find(device_, note.directory, DirectoryCache::Search::hints_only)
-            : find_known_directory(store_, device_, note.directory);
+            : find_known_directory(store_, device_, note.directory, searched_in_vain_);
     last_directory_ = note.directory;
     last_handle_ = found ? *found : nullptr;
     last_error_ = found.status();
@@ -36,6 +36,7 @@ DatabaseResult RowWriter::write(std::vector<ChangeNote>& notes, const std::set<s
     left_unread_ = false;
     last_directory_ = 0;
     last_handle_.reset();
+    searched_in_vain_ = false;
     for (const ChangeNote& note : notes)
         ++(note.source == ChangeNote::Source::own ? statistics_.reported : statistics_.observed);
     // Equal notes are one, and a directory's notes together need it opened once.

@@ -81,6 +81,8 @@ class RowWriter {
     DirectoryCache::Handle last_handle_;
     /// Why there is no last_handle_.
     Status last_error_;
+    /// For a directory of the group at hand.
+    bool searched_in_vain_ = false;
 };
 
 } // namespace host

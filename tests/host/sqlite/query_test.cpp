@@ -13,6 +13,15 @@ using Op = Predicate::Operator;
 
 class QueryTest : public IndexFixture {};
 
+class ListsCounted : public SystemCalls {
+  public:
+    ssize_t getdents(int directory, void* buffer, std::size_t size) override {
+        ++lists;
+        return SystemCalls::getdents(directory, buffer, size);
+    }
+    std::atomic<int> lists{0};
+};
+
 TEST_F(QueryTest, NameQueryFindsFilesDirectoriesAndLinks) {
     make("a/one.mp3");
     make("a/two.ogg");
@@ -140,14 +149,6 @@ TEST_F(QueryTest, HitsSurviveRenamingTheirDirectory) {
 }
 
 TEST_F(QueryTest, TheIndexKnowsTheWayToFoldersThatWereNeverAskedFor) {
-    class ListsCounted : public SystemCalls {
-      public:
-        ssize_t getdents(int directory, void* buffer, std::size_t size) override {
-            ++lists;
-            return SystemCalls::getdents(directory, buffer, size);
-        }
-        std::atomic<int> lists{0};
-    };
     make("a/b/c/one");
     make("a/b/d/two");
     tag_outside("a/b/c/one", "A", "x");
@@ -165,6 +166,25 @@ TEST_F(QueryTest, TheIndexKnowsTheWayToFoldersThatWereNeverAskedFor) {
     EXPECT_TRUE((*query)->next(hit).ok());
     EXPECT_TRUE((*query)->next(hit).ok());
     EXPECT_EQ(counting.lists, 0) << "folders were searched through";
+}
+
+TEST_F(QueryTest, FortyFoldersThatAreGoneAreSearchedForOnce) {
+    ASSERT_TRUE(indexes().create(device_, "A", kText).ok());
+    for (int i = 0; i < 42; ++i) {
+        const std::string file = std::to_string(i) + "/" + std::to_string(i) + ".mp3";
+        make(file);
+        tag(file, "A", "x");
+    }
+    indexes().shut_down();
+    for (int i = 0; i < 40; ++i)
+        std::filesystem::remove_all(root_ + "/" + std::to_string(i));
+    DirectoryCache::instance().clear();
+    ListsCounted counting;
+    const ScopedSystemCalls scope(counting);
+    EXPECT_EQ(find(contains("A", "x")), (Leaves{"40.mp3", "41.mp3"}));
+    // Three folders are left, each listed by two calls, for the query and for the index writer.
+    EXPECT_LE(counting.lists, 40);
+    EXPECT_EQ(find(contains("A", "x")), (Leaves{"40.mp3", "41.mp3"}));
 }
 
 TEST_F(QueryTest, RenamingThroughTheLibraryMovesTheRow) {
