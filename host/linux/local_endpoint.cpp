@@ -106,9 +106,18 @@ void LocalEndpoint::close() {
 
 void LocalEndpoint::remove_files_at_exit() {
     LocalEndpoint& endpoint = instance();
+    std::shared_ptr<LocalPeers> peers;
+    {
+        MutexLock lock(endpoint.mutex_);
+        if (endpoint.owner_ != ::getpid())
+            return;
+        peers = endpoint.peers_;
+    }
+    // Without the lock: what is received may need it.
+    if (peers != nullptr)
+        peers->finish_answers();
     MutexLock lock(endpoint.mutex_);
-    if (endpoint.owner_ == ::getpid())
-        endpoint.close();
+    endpoint.close();
 }
 
 LocalReceiver* LocalEndpoint::receiver() const {

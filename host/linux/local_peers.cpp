@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <array>
+#include <chrono>
 #include <cstring>
 #include <sys/epoll.h>
 #include <sys/socket.h>
@@ -37,6 +38,11 @@ Status LocalPeers::start() {
 void LocalPeers::stop() {
     EventThread::instance().forget(listening_watch_.exchange(0), listening_.get());
     ::shutdown(listening_.get(), SHUT_RDWR);
+}
+
+void LocalPeers::finish_answers() {
+    if (!EventThread::is_current() && answering_.try_lock_for(std::chrono::seconds(1)))
+        answering_.unlock();
 }
 
 void LocalPeers::accept_peers() {
@@ -87,6 +93,7 @@ void LocalPeers::serve(std::uint64_t id, std::uint32_t events) {
     const auto found = peers_.find(id);
     if (found == peers_.end())
         return;
+    const std::lock_guard answering(answering_);
     Peer& peer = found->second;
     bool stays = (events & EPOLLERR) == 0;
     if (stays && !peer.unsent.empty())

@@ -5,6 +5,7 @@
 #include "host/api/local_transport.h"
 #include <atomic>
 #include <map>
+#include <mutex>
 
 namespace host {
 
@@ -21,6 +22,9 @@ class LocalPeers : public std::enable_shared_from_this<LocalPeers> {
     Status start();
     /// Takes no new connections; those that there are stay until the other side leaves.
     void stop();
+    /// For a process that is about to end, as a request just now may have asked it to: whoever sent what is
+    /// being read hears that it has arrived. A second at most.
+    void finish_answers();
 
     static void set_frame_time_limit(std::int64_t nanoseconds);
 
@@ -47,6 +51,8 @@ class LocalPeers : public std::enable_shared_from_this<LocalPeers> {
     const Descriptor listening_;
     LocalReceiver& receiver_;
     std::atomic<EventThread::Watch> listening_watch_{0};
+    /// Held by the event thread from the reading of requests until they are answered.
+    std::timed_mutex answering_;
     // The event thread's alone.
     std::map<std::uint64_t, Peer> peers_;
     std::uint64_t next_ = 1;
