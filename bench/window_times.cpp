@@ -8,6 +8,7 @@
 #include "samples/SampleLibrary.h"
 #include "support/Figures.h"
 #include "support/Surroundings.h"
+#include "support/ThreadTimes.h"
 #include "support/WindowWatch.h"
 #include <IndexMaintenance.h>
 #include <ListView.h>
@@ -74,10 +75,18 @@ double WaitForJob(const FileIndexListItem& row, const bench::Stopwatch& watch, s
     return static_cast<double>(expected) / seconds;
 }
 
+/// Nothing is left of the start: the window is drawn, and the volume walked for what happened before it.
+void WaitUntilStarted() {
+    do
+        snooze(1000000);
+    while (bench::ThreadTimes::Now().Has("index walker"));
+}
+
 double RunJobWithoutWindow(void (FileIndexListItem::*start)(), std::size_t expected) {
     QuirnelApp app;
     app.CheckCreateIndices();
     const auto row = RowWithoutWindow();
+    WaitUntilStarted();
     const bench::Stopwatch watch;
     (row.get()->*start)();
     const double rate = WaitForJob(*row, watch, expected);
@@ -101,8 +110,7 @@ class WatchedApp : public QuirnelApp {
             QuirnelApp::MessageReceived(message);
             return;
         }
-        // The window is drawn and nothing else is left of the start.
-        snooze(1000000);
+        WaitUntilStarted();
         FileIndexListItem* row = nullptr;
         const bench::Stopwatch watch;
         IndexWindowSlot().UseLocked([&](BWindow* window) {
